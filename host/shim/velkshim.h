@@ -1,0 +1,77 @@
+// The shim stands between the provider library and the machine. It defines the libc calls through
+// which the library reaches files, time, threads and the host's identity, and so gives an
+// unchanged binary another root folder and another clock.
+//
+// It works linked in front of libc (velkhost, the test programs) and as a preload under any other
+// broker; there it is set up by the environment variables VELKSHIM_ROOT, VELKSHIM_CLOCK ("real" or
+// "virtual"), VELKSHIM_EPOCH (seconds) and VELKSHIM_NODE. Functions return 0 or an errno value
+// unless stated. All are safe to call from any thread.
+#pragma once
+
+#include <stddef.h>
+#include <stdint.h>
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+#define VELKSHIM_API __attribute__((visibility("default")))
+
+// ---- Files ----
+
+// Puts the host's fixed paths under `folder` (copied; it must exist): /tmp/velkdebug.txt,
+// /tmp/sfcb, /tmp/networkflag, /var/tmp/filestore, /var/tmp/ZEB, /etc/cim, /etc/velkhost,
+// /usr/lib/cim and /dev/ipmi0. Every other path stays where it is. NULL ends the re-rooting.
+VELKSHIM_API int velkshim_set_root(const char *folder);
+
+// Where `path` really lies: writes at most `size` bytes with the terminator to `out` and returns
+// 1 when the path was re-rooted, 0 when it stands as it is. Runs of '/' count as one.
+VELKSHIM_API int velkshim_map(const char *path, char *out, size_t size);
+
+// Called after a descriptor that was opened for writing on a re-rooted path has been closed, on
+// the thread that closed it. `path` is the fixed path, `now_us` the clock's time.
+typedef void (*velkshim_file_observer)(void *context, const char *path, int64_t now_us);
+VELKSHIM_API void velkshim_observe_files(velkshim_file_observer observer, void *context);
+
+// ---- Clock ----
+
+// From here on time stands still but for pauses: it jumps to the earliest wake-up once every
+// thread that takes part is pausing, and one sleeper is woken at a time, in order of its wake-up
+// time and then of its arrival. `epoch_us` is the wall-clock time to begin with, in microseconds
+// since 1970-01-01 UTC.
+VELKSHIM_API void velkshim_use_virtual_clock(int64_t epoch_us);
+VELKSHIM_API void velkshim_use_real_clock(void);
+
+// The clock's time, microseconds since 1970-01-01 UTC, under either clock.
+VELKSHIM_API int64_t velkshim_now_us(void);
+
+// A thread takes part from its first pause on, or from its creation when another thread that takes
+// part created it with pthread_create. These two let a thread join and leave by hand.
+VELKSHIM_API void velkshim_thread_enter(void);
+VELKSHIM_API void velkshim_thread_leave(void);
+
+// Around a wait for anything but time (a join, a condition, a read): the calling thread does not
+// hold the virtual clock up in between. Both do nothing for a thread that does not take part.
+VELKSHIM_API void velkshim_wait_begin(void);
+VELKSHIM_API void velkshim_wait_end(void);
+
+// Called for every pause that begins, on the pausing thread, before it pauses.
+typedef void (*velkshim_pause_observer)(void *context, int64_t now_us, int64_t length_us);
+VELKSHIM_API void velkshim_observe_pauses(velkshim_pause_observer observer, void *context);
+
+// ---- Host ----
+
+// The node name that uname reports (copied, cut to its field); NULL for the machine's own.
+VELKSHIM_API void velkshim_set_node_name(const char *name);
+
+// ---- Faults ----
+
+// Asked before each call that the shim serves, with the name of the step: "open:<fixed path>",
+// "unlink:<fixed path>", "rmdir:<fixed path>", "opendir:<fixed path>", "dlopen:<fixed path>",
+// "thread.create". A result other than 0 is the errno with which the call then fails.
+typedef int (*velkshim_fault_hook)(void *context, const char *step);
+VELKSHIM_API void velkshim_set_fault_hook(velkshim_fault_hook hook, void *context);
+
+#ifdef __cplusplus
+}
+#endif
