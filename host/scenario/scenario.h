@@ -1,43 +1,40 @@
-// The scenario: what the stand-in host has, how each of its services answers in turn, and which
-// faults strike. One per process, read from a TOML file; shared by the providers, the job library,
-// the shim's hooks and the command line.
+// The scenario at work: what the stand-in host has, how each of its services answers in turn, and
+// which faults strike. One per process; shared by the providers, the job library, the shim's hooks
+// and the command line. Needs neither the shim nor the broker, so that the providers also run in
+// any other CMPI broker.
 #pragma once
 
-#include <cstdint>
+#include "host/scenario/answer_book.h"
+#include "host/scenario/fault_rules.h"
+#include "host/scenario/model.h"
+
 #include <memory>
-#include <mutex>
-#include <optional>
 #include <string>
-#include <string_view>
-#include <vector>
 
 namespace velkhost::scenario {
 
-// A fault strikes at a named step: it lets `after` passes of the step go by, then strikes `count`
-// times. `match` narrows the step to those whose subject (a URI, a path, a class name) contains
-// it; empty matches all.
-struct FaultRule {
-    std::string step;
-    std::string match;
-    int after = 0;
-    int count = 1;
-    int code = 0;         // errno for a libc step, CIM status for a broker or provider step
-    std::string message;  // status message, where the step carries one
-};
+// Where a process finds its scenario unless it was given one.
+inline constexpr const char *kScenarioPath = "/etc/velkhost/scenario.toml";
 
-// What an installation service answers to one call, and what its job reports from then on.
-struct ServiceAnswer {
-    std::string match;               // URI substring that this answer is for; empty for any
-    std::uint32_t return_value = 4096;
-    int status = 0;                  // CIM status of the call
-    std::string message;
-    struct JobLook {
-        std::optional<std::string> job_status;  // no value: the property is null
-        std::uint16_t job_state = 4;            // DMTF job state: 4 running, 7 completed, ...
-        int looks = 1;                          // how many reads in a row see this
-        bool absent = false;                    // the job instance cannot be had
-    };
-    std::vector<JobLook> job;        // the last one holds for ever
+class VELKSCENARIO_API Scenario {
+  public:
+    // The settings as described, with every turn and every fault at its beginning.
+    explicit Scenario(Description description = {});
+
+    // The process's scenario. The first call reads kScenarioPath unless set_current came before; a
+    // file that is not there gives the built-in default. Throws ScenarioError for one that is there
+    // and cannot be used; the next call tries again. Safe from any thread.
+    static std::shared_ptr<Scenario> current();
+
+    // Makes `scenario` the process's own; nullptr: the next current() reads the file again.
+    static void set_current(std::shared_ptr<Scenario> scenario);
+
+    const std::string source;
+    const HostSettings host;
+    const JobSettings jobs;
+    const FileTransferSettings file_transfer;
+    AnswerBook management_controller;
+    FaultRules faults;
 };
 
 }  // namespace velkhost::scenario

@@ -1,0 +1,91 @@
+// What a scenario says, as plain data: the host, how each of its services answers in turn, and the
+// faults that strike. Filled by the reader; the running parts (AnswerBook, FaultRules) take copies.
+#pragma once
+
+#include <cstdint>
+#include <limits>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#define VELKSCENARIO_API [[gnu::visibility("default")]]
+
+namespace velkhost::scenario {
+
+// A scenario file that cannot be used; what() reads "file:line: message".
+class VELKSCENARIO_API ScenarioError : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+// [host]
+struct HostSettings {
+    std::string node = "esxi-01.example.com";    // node name that the host reports, 1 to 64 bytes
+    std::int64_t start_us = 1772438400'000'000;  // virtual clock's first moment, us since 1970 UTC
+};
+
+// [jobs]: the job library.
+struct JobSettings {
+    std::uint32_t poll_seconds = 10;  // pause between two queries of a job's status function
+    std::uint32_t first_number = 1;   // number of the first job: 1 gives "VELK-1"
+};
+
+// [file_transfer]
+struct FileTransferSettings {
+    // Files (absolute paths) that count as transferred by the service before the run began.
+    std::vector<std::string> transferred;
+};
+
+// DMTF job states (CIM_ConcreteJob.JobState) that the services use.
+inline constexpr std::uint16_t kJobRunning = 4;
+inline constexpr std::uint16_t kJobCompleted = 7;
+inline constexpr std::uint16_t kJobException = 10;
+
+// What one or more reads of a job's instance see.
+struct JobLook {
+    std::optional<std::string> job_status;  // no value: the property is null
+    std::uint16_t job_state = kJobRunning;
+    std::uint32_t looks = 1;  // how many reads in a row see this
+    bool absent = false;      // the job's instance cannot be had
+};
+
+// Return value of CIM_SoftwareInstallationService methods: parameters checked, job started.
+inline constexpr std::uint32_t kJobStarted = 4096;
+
+// What an installation service answers to one call, and what its job reports from then on.
+struct ServiceAnswer {
+    std::string match;  // part of the URIs that this answer is for; empty for the rest
+    std::uint32_t return_value = kJobStarted;
+    int status = 0;       // CIM status of the call (DSP0200); 0 is success
+    std::string message;  // message of a failed status
+    // No value: the service's usual job. Empty: no job, although the answer says that one started.
+    // The last look holds for ever.
+    std::optional<std::vector<JobLook>> job;
+};
+
+// A fault strikes at a named step: it lets `after` passes of the step go by, then strikes `count`
+// times. A step that ends in '*' stands for all that begin so. `match` narrows it to passes whose
+// subject (a URI, a class name, a job id) contains it; empty matches all.
+struct FaultRule {
+    static constexpr std::uint32_t kAlways = std::numeric_limits<std::uint32_t>::max();
+
+    std::string step;
+    std::string match;
+    std::uint32_t after = 0;
+    std::uint32_t count = 1;
+    int code = 0;         // errno for a libc step, CIM status for any other
+    std::string message;  // status message, for steps that carry one
+    int line = 0;         // where the rule stands in its file; 0 when it comes from elsewhere
+};
+
+struct Description {
+    std::string source = "built-in default";  // the file's name as it was given
+    HostSettings host;
+    JobSettings jobs;
+    std::vector<ServiceAnswer> management_controller;
+    FileTransferSettings file_transfer;
+    std::vector<FaultRule> faults;
+};
+
+}  // namespace velkhost::scenario

@@ -1,0 +1,37 @@
+#include "host/scenario/scenario.h"
+
+#include "host/scenario/reader.h"
+
+#include <mutex>
+#include <utility>
+
+namespace velkhost::scenario {
+namespace {
+
+std::mutex current_mutex;
+std::shared_ptr<Scenario> current_scenario;
+
+}  // namespace
+
+Scenario::Scenario(Description description)
+    : source(std::move(description.source)),
+      host(std::move(description.host)),
+      jobs(description.jobs),
+      file_transfer(std::move(description.file_transfer)),
+      management_controller(std::move(description.management_controller)),
+      faults(std::move(description.faults)) {}
+
+std::shared_ptr<Scenario> Scenario::current() {
+    const std::lock_guard lock(current_mutex);
+    if (!current_scenario) {
+        current_scenario = std::make_shared<Scenario>(read_description_if_there(kScenarioPath));
+    }
+    return current_scenario;
+}
+
+void Scenario::set_current(std::shared_ptr<Scenario> scenario) {
+    const std::lock_guard lock(current_mutex);
+    current_scenario.swap(scenario);
+}
+
+}  // namespace velkhost::scenario
