@@ -1,0 +1,55 @@
+#!/usr/bin/env bash
+# Shows one installation request from end to end: builds the provider library and the stand-in
+# host, makes the example packages, and installs them. See --help.
+set -euo pipefail
+# shellcheck source=scripts/packages.sh
+source "$(dirname -- "${BASH_SOURCE[0]}")/scripts/packages.sh"
+
+usage() {
+  cat <<'TEXT'
+usage: ./run.sh [--] [ARGUMENT...]
+
+Builds what is missing and runs `velkhost install` on the example packages, as
+scenarios/default.toml describes the host. Arguments go to that command, such as
+--json, --clock real, --scenario FILE; package URIs among them replace the examples.
+The exit code is velkhost's, or 3 when packages must be installed by hand first.
+TEXT
+}
+
+build() {
+  local log=$root/build/logs/run.log
+  mkdir -p "$root/build/logs"
+  say "Building (the first time takes a minute or two) ..."
+  if ! { configured_here release || cmake --preset release --fresh -DBUILD_TESTING=OFF; } >"$log" 2>&1 ||
+    ! cmake --build --preset release --target provider/all host/all >>"$log" 2>&1; then
+    tail -n 40 "$log" >&2
+    die "The build failed; the whole log is $log"
+  fi
+}
+
+# The example packages in the order of the request, as file:// URIs, one a line.
+example_uris() {
+  local folder=$root/build/packages name
+  bash "$root/examples/make_packages.sh" "$folder" >&2
+  while read -r name; do
+    [[ -z $name || $name == '#'* ]] || say "file://$folder/$name"
+  done <"$root/examples/packages/default.list"
+}
+
+main() {
+  [[ ${1-} != -- ]] || shift
+  local argument scenario=(--scenario "$root/scenarios/default.toml") uris=() own_uris=''
+  for argument in "$@"; do
+    case $argument in
+      -h | --help) usage && exit ;;
+      --scenario*) scenario=() ;;
+      *://*) own_uris=yes ;;
+    esac
+  done
+  ensure_packages run
+  (cd "$root" && build)
+  [[ $own_uris ]] || mapfile -t uris < <(example_uris)
+  exec "$root/build/release/bin/velkhost" install "${scenario[@]}" "$@" "${uris[@]}"
+}
+
+main "$@"
