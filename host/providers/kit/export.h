@@ -1,0 +1,66 @@
+// The CMPI side of a provider: function tables and factories.
+#pragma once
+
+#include "host/providers/kit/provider.h"
+
+#include <cmpi/cmpidt.h>
+#include <cmpi/cmpift.h>
+
+#include <exception>
+
+namespace velkhost::providers {
+
+// What stands behind the `hdl` of a provider object.
+struct Binding {
+    const CMPIBroker *broker;
+    Provider *provider;
+};
+
+CMPIInstanceMIFT instance_table(const char *name);
+CMPIMethodMIFT method_table(const char *name);
+
+// Tells the broker that a factory ended well, or with the exception in flight.
+void report_made(CMPIStatus *status);
+void report_exception(const CMPIBroker *broker, CMPIStatus *status);
+
+// One provider object serves all kinds of its class; made at the first factory call.
+template <typename Class>
+Provider &provider_of() {
+    static Class provider;
+    return provider;
+}
+
+// The body of a factory. `Mi` is CMPIInstanceMI or CMPIMethodMI, `table` its function table.
+template <typename Class, typename Mi, typename Table>
+Mi *make_mi(const CMPIBroker *broker, CMPIStatus *status, Table &table) {
+    static Binding binding;
+    static Mi mi;
+    try {
+        binding = {broker, &provider_of<Class>()};
+        mi = {&binding, &table};
+    } catch (const std::exception &) {
+        report_exception(broker, status);
+        return nullptr;
+    }
+    report_made(status);
+    return &mi;
+}
+
+}  // namespace velkhost::providers
+
+// Exports `Class` (derived from Provider) as the provider `NAME`, for instances and methods.
+// A macro because a factory's symbol is made from the provider's name.
+// NOLINTBEGIN(cppcoreguidelines-macro-usage,bugprone-macro-parentheses)
+#define VELKHOST_EXPORT_PROVIDER(NAME, Class)                                                  \
+    extern "C" [[gnu::visibility("default")]] CMPIInstanceMI *NAME##_Create_InstanceMI(        \
+        const CMPIBroker *broker, const CMPIContext * /*context*/, CMPIStatus *status) {       \
+        static CMPIInstanceMIFT table = velkhost::providers::instance_table("instance" #NAME); \
+        return velkhost::providers::make_mi<Class, CMPIInstanceMI>(broker, status, table);     \
+    }                                                                                          \
+    extern "C" [[gnu::visibility("default")]] CMPIMethodMI *NAME##_Create_MethodMI(            \
+        const CMPIBroker *broker, const CMPIContext * /*context*/, CMPIStatus *status) {       \
+        static CMPIMethodMIFT table = velkhost::providers::method_table("method" #NAME);       \
+        return velkhost::providers::make_mi<Class, CMPIMethodMI>(broker, status, table);       \
+    }                                                                                          \
+    static_assert(true, "takes the semicolon")
+// NOLINTEND(cppcoreguidelines-macro-usage,bugprone-macro-parentheses)
