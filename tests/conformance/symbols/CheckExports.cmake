@@ -1,0 +1,46 @@
+# cmake -DNM=.. -DLIBRARY=.. -DEXPORTS=<list> [-DSANITIZE=..] -P CheckExports.cmake
+#
+# The library defines the names of the list as the kind stated there, and no others.
+
+cmake_minimum_required(VERSION 3.25)
+include(${CMAKE_CURRENT_LIST_DIR}/DynamicSymbols.cmake)
+
+set(expected "")
+file(STRINGS ${EXPORTS} lines REGEX "^[^#]")
+foreach(line IN LISTS lines)
+  if(NOT line MATCHES "^([A-Za-z0-9_]+) +(data|function)$")
+    message(FATAL_ERROR "${EXPORTS}: \"${line}\" is not a name and a kind")
+  endif()
+  list(APPEND expected "${CMAKE_MATCH_1} (${CMAKE_MATCH_2})")
+endforeach()
+
+set(defined "")
+velk_read_symbols(lines --defined-only)
+foreach(line IN LISTS lines)
+  string(REGEX MATCH "^([^ ]+) ([A-Za-z])" line "${line}")
+  set(name ${CMAKE_MATCH_1})
+  set(letter ${CMAKE_MATCH_2})
+  set(kind "${letter} in the output of nm")
+  if(letter MATCHES "^[TWi]$")
+    set(kind function)
+  elseif(letter MATCHES "^[BDGRSVu]$")
+    set(kind data)
+  endif()
+  # The address sanitizer marks each exported variable with one of its own.
+  if(NOT (SANITIZE AND name MATCHES "^__odr_asan"))
+    list(APPEND defined "${name} (${kind})")
+  endif()
+endforeach()
+
+set(complaints "")
+foreach(symbol IN LISTS expected)
+  if(NOT symbol IN_LIST defined)
+    list(APPEND complaints "missing: ${symbol}")
+  endif()
+endforeach()
+foreach(symbol IN LISTS defined)
+  if(NOT symbol IN_LIST expected)
+    list(APPEND complaints "not in the list: ${symbol}")
+  endif()
+endforeach()
+velk_report("${LIBRARY} does not export what ${EXPORTS} says" ${complaints})
