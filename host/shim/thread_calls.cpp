@@ -1,0 +1,82 @@
+// The calls that begin and join threads, and the part that threads take in the virtual clock.
+#include "host/shim/faults.h"
+#include "host/shim/futex.h"
+#include "host/shim/libc_calls.h"
+#include "host/shim/velkshim.h"
+#include "host/shim/virtual_clock.h"
+
+namespace velkhost::shim {
+namespace {
+
+using ThreadBody = void *(*)(void *);
+
+// What the new thread shall do. Lives in the frame of pthread_create, which waits until the thread
+// has taken it over: memory of the heap would have to be freed on a thread that a sanitizer does
+// not know yet.
+struct Birth {
+    ThreadBody body;
+    void *argument;
+    VirtualClock::Token token;
+    Signal taken_over;
+};
+
+// Nothing here may be noexcept: pthread_exit and cancellation unwind through it.
+void *run_thread(void *birth_of_thread) {
+    Birth &birth = *static_cast<Birth *>(birth_of_thread);
+    const ThreadBody body = birth.body;
+    void *const argument = birth.argument;
+    virtual_clock.adopt(birth.token);
+    birth.taken_over.set();
+    return body(argument);
+}
+
+int create_thread(pthread_t *thread, const pthread_attr_t *attributes, ThreadBody body,
+                  void *argument) {
+    Birth birth{body, argument, virtual_clock.reserve_child(), {}};
+    const int error = libc().pthread_create(thread, attributes, run_thread, &birth);
+    if (error == 0) {
+        birth.taken_over.wait();
+    } else if (birth.token != 0) {
+        virtual_clock.cancel_child(birth.token);
+    }
+    return error;
+}
+
+}  // namespace
+}  // namespace velkhost::shim
+
+namespace shim = velkhost::shim;
+
+extern "C" {
+
+VELKSHIM_API int pthread_create(pthread_t *thread, const pthread_attr_t *attributes,
+                                void *(*body)(void *), void *argument) noexcept {
+    const int error = shim::fault_at("thread.create");
+    return error != 0 ? error : shim::create_thread(thread, attributes, body, argument);
+}
+
+// Not noexcept: a join is a cancellation point.
+VELKSHIM_API int pthread_join(pthread_t thread, void **result) {
+    const shim::VirtualClock::Join join(shim::virtual_clock, thread);
+    return shim::libc().pthread_join(thread, result);
+}
+
+}  // extern "C"
+
+// ---- The shim's own interface ----
+
+void velkshim_thread_enter(void) {
+    shim::virtual_clock.enter();
+}
+
+void velkshim_thread_leave(void) {
+    shim::virtual_clock.leave();
+}
+
+void velkshim_wait_begin(void) {
+    shim::virtual_clock.wait_begin();
+}
+
+void velkshim_wait_end(void) {
+    shim::virtual_clock.wait_end();
+}
