@@ -27,9 +27,17 @@ build() {
   fi
 }
 
+# In the checkout, unless its path is too long for the library's texts of 199 bytes.
+packages_folder() {
+  local folder=$root/build/packages
+  ((${#folder} <= 120)) || folder=/tmp/velk-packages-$UID
+  say "$folder"
+}
+
 # The example packages in the order of the request, as file:// URIs, one a line.
 example_uris() {
-  local folder=$root/build/packages name
+  local folder name
+  folder=$(packages_folder)
   bash "$root/examples/make_packages.sh" "$folder" >&2
   while read -r name; do
     [[ -z $name || $name == '#'* ]] || say "file://$folder/$name"
