@@ -84,12 +84,12 @@ Object object_with(Table &table) {
     return object;
 }
 
-template <auto kSlot, class Result, class Object, class... Args, std::size_t... I>
+template <auto Slot, class Result, class Object, class... Args, std::size_t... I>
 void expect_call(Result (*form)(Object *, Args...), std::index_sequence<I...>) {
-    using Function = typename SlotOf<decltype(kSlot)>::FunctionType;
+    using Function = typename SlotOf<decltype(Slot)>::FunctionType;
     using Fake = Recorder<Function>;
-    typename SlotOf<decltype(kSlot)>::TableType table{};
-    table.*kSlot = &Fake::record;
+    typename SlotOf<decltype(Slot)>::TableType table{};
+    table.*Slot = &Fake::record;
     auto object = object_with<std::remove_const_t<Object>>(table);
     Fake::calls = 0;
 
@@ -100,9 +100,9 @@ void expect_call(Result (*form)(Object *, Args...), std::index_sequence<I...>) {
     EXPECT_TRUE(same(result, sample<Result>(kResult)));
 }
 
-template <auto kSlot, class Result, class Object, class... Args>
+template <auto Slot, class Result, class Object, class... Args>
 void expect_forwards(Result (*form)(Object *, Args...)) {
-    expect_call<kSlot>(form, std::index_sequence_for<Args...>{});
+    expect_call<Slot>(form, std::index_sequence_for<Args...>{});
 }
 
 }  // namespace

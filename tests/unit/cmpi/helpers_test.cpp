@@ -39,11 +39,14 @@ CMPIStatus filled() {
     return {CMPI_RC_ERROR, made_string};
 }
 
+// Without braces on purpose: the form must be one statement, also in front of an else.
 CMPIStatus return_code(bool failed) {
+    // NOLINTBEGIN(readability-braces-around-statements,readability-else-after-return)
     if (failed)
         CMReturn(CMPI_RC_ERR_FAILED);
     else
         CMReturn(CMPI_RC_OK);
+    // NOLINTEND(readability-braces-around-statements,readability-else-after-return)
 }
 
 CMPIStatus return_string(CMPIString *message) {

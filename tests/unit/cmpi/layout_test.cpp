@@ -17,6 +17,9 @@ struct Row {
     unsigned long long declared;
 };
 
+template <class Type>
+constexpr std::size_t kSizeOf = sizeof(Type);
+
 // NOLINTBEGIN(cppcoreguidelines-macro-usage,bugprone-macro-parentheses): names become texts
 #define SIZE(type, size) Row{"size of " #type, size, sizeof(type)},
 #define ALIGNMENT(type, alignment) Row{"alignment of " #type, alignment, alignof(type)},
@@ -40,7 +43,7 @@ const std::vector<Row> kOffsets = {
 
 #undef MEMBER
 #define MEMBER(type, member, offset, size) \
-    Row{"size of " #type "." #member, size, sizeof(type::member)},
+    Row{"size of " #type "." #member, size, kSizeOf<decltype(type::member)>},
 const std::vector<Row> kMemberSizes = {
 #include "present.inc"
 };
@@ -48,10 +51,10 @@ const std::vector<Row> kMemberSizes = {
 #define ADDED_SIZE(type, size) #type,
 #define ADDED_ALIGNMENT(type, alignment) #type,
 #define ADDED_CONSTANT(name, value) #name,
-#define ADDED_MEMBER(type, member, offset, size) #type "." #member,
+#define ADDED_MEMBER(type, member, offset, size) std::string(#type ".") + #member,
 #define CHANGED_SIZE(type, size) #type,
 #define CHANGED_CONSTANT(name, value) #name,
-#define CHANGED_MEMBER(type, member, offset, size) #type "." #member,
+#define CHANGED_MEMBER(type, member, offset, size) std::string(#type ".") + #member,
 const std::vector<std::string> kLater = {
 #include "later.inc"
 };

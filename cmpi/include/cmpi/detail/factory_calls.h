@@ -76,12 +76,12 @@ inline CMPIString *CDGetType(const CMPIBroker *broker, const void *object, CMPIS
 
 inline CMPIStatus CMLogMessage(const CMPIBroker *broker, CMPISeverity severity, const char *id,
                                const char *text, const CMPIString *string) {
-    return broker->eft->logMessage(broker, severity, id, text, string);
+    return broker->eft->logMessage(broker, static_cast<int>(severity), id, text, string);
 }
 
 inline CMPIStatus CMTraceMessage(const CMPIBroker *broker, CMPILevel level, const char *component,
                                  const char *text, const CMPIString *string) {
-    return broker->eft->trace(broker, level, component, text, string);
+    return broker->eft->trace(broker, static_cast<int>(level), component, text, string);
 }
 
 inline CMPIStatus CMOpenMessageFile(const CMPIBroker *broker, const char *file,
