@@ -51,8 +51,10 @@ own_files() {
 }
 
 step_format() {
-  own_files '*.h' '*.c' '*.cpp' | xargs -0r clang-format-14 --dry-run -Werror
-  { own_files '*.sh' && printf '.ci/run\0'; } | xargs -0r shellcheck --external-sources
+  local verdict=0
+  own_files '*.h' '*.c' '*.cpp' | xargs -0r clang-format-14 --dry-run -Werror || verdict=1
+  { own_files '*.sh' && printf '.ci/run\0'; } | xargs -0r shellcheck --external-sources || verdict=1
+  ((verdict == 0)) || return 1
   say "Sources and scripts are well formed"
 }
 

@@ -62,7 +62,7 @@ def look_at(command, settings):
     mark = MEMORY / digest_of(command, settings)
     if mark.exists():
         return file, "", 0.0
-    result = subprocess.run([TOOL, "-p", str(BUILD), "--quiet", file],
+    result = subprocess.run([TOOL, "-p", str(BUILD), "--quiet", "--extra-arg=-Wno-unknown-warning-option", file],
                             stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True, check=False)
     seconds = time.monotonic() - start
     if result.returncode == 0:
