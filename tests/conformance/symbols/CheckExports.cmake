@@ -1,4 +1,4 @@
-# cmake -DNM=.. -DLIBRARY=.. -DEXPORTS=<list> [-DSANITIZE=..] -P CheckExports.cmake
+# cmake -DNM=.. -DLIBRARY=.. -DEXPORTS=<list> [-DSANITIZE=..] [-DCOVERAGE=ON] -P CheckExports.cmake
 #
 # The library defines the names of the list as the kind stated there, and no others.
 
@@ -14,6 +14,16 @@ foreach(line IN LISTS lines)
   list(APPEND expected "${CMAKE_MATCH_1} (${CMAKE_MATCH_2})")
 endforeach()
 
+# What instrumentation adds: a mark of the address sanitizer's per variable; the runtime of gcov.
+set(instrumentation "")
+if(SANITIZE)
+  list(APPEND instrumentation "__odr_asan.*")
+endif()
+if(COVERAGE)
+  list(APPEND instrumentation "__gcov_.*" "mangle_path")
+endif()
+list(JOIN instrumentation "|" instrumentation)
+
 set(defined "")
 velk_read_symbols(lines --defined-only)
 foreach(line IN LISTS lines)
@@ -26,8 +36,7 @@ foreach(line IN LISTS lines)
   elseif(letter MATCHES "^[BDGRSVu]$")
     set(kind data)
   endif()
-  # The address sanitizer marks each exported variable with one of its own.
-  if(NOT (SANITIZE AND name MATCHES "^__odr_asan"))
+  if(NOT name MATCHES "^(${instrumentation})$")
     list(APPEND defined "${name} (${kind})")
   endif()
 endforeach()
