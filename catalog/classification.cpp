@@ -4,6 +4,10 @@
 #include <string_view>
 
 #include "installers/ESW_update.h"
+#include "installers/Emulex_update.h"
+#include "installers/Qlogic_update.h"
+#include "installers/brocade_update.h"
+#include "installers/facade_update.h"
 #include "velk/bounded_text.h"
 #include "velk/debug_log.h"
 
@@ -24,36 +28,41 @@ bool name_begins(const PackageRecord &package, std::string_view keyword) {
     return view(package.Name).starts_with(keyword);
 }
 
+bool name_begins_and_is_fibre(const PackageRecord &package, std::string_view keyword) {
+    return name_begins(package, keyword) && category_is(package, "Fibre");
+}
+
 struct Rule {
     Test test;
     std::string_view keyword;
     Installer installer;
 };
 
-// The families whose installers this version does not have: their packages are not installed and
-// keep the status that they had.
+// A family whose installer this version does not have: its packages are not installed and keep the
+// status that they had.
 constexpr Installer kNoInstaller = nullptr;
 
 // The first rule that fits decides. Categories come before names, so that a disk or RAID package
 // of an adapter maker goes to the LSI service.
 // clang-format off
 constexpr std::array kRules = {
-    Rule{category_is,   "UEFI",            installESWPkg},
-    Rule{category_is,   "RXC",             installESWPkg},
-    Rule{category_is,   "FPGA",            installESWPkg},
-    Rule{category_is,   "Diagnostics",     installESWPkg},
-    Rule{category_is,   "RXC2",            installESWPkg},
-    Rule{category_is,   "Hard Disk Drive", kNoInstaller},
-    Rule{category_is,   "SAS",             kNoInstaller},
-    Rule{category_is,   "Kestroval",       kNoInstaller},
-    Rule{name_contains, "Broadcom",        kNoInstaller},
-    Rule{name_begins,   "VMware",          kNoInstaller},
-    Rule{name_begins,   "Emulex",          kNoInstaller},
-    Rule{name_begins,   "QLogic",          kNoInstaller},
-    Rule{name_begins,   "Qlogic",          kNoInstaller},
-    Rule{name_contains, "FC3172",          kNoInstaller},
-    Rule{name_contains, "FC5172",          kNoInstaller},
-    Rule{name_begins,   "Brocade",         kNoInstaller},
+    Rule{category_is,              "UEFI",            installESWPkg},
+    Rule{category_is,              "RXC",             installESWPkg},
+    Rule{category_is,              "FPGA",            installESWPkg},
+    Rule{category_is,              "Diagnostics",     installESWPkg},
+    Rule{category_is,              "RXC2",            installESWPkg},
+    Rule{category_is,              "Hard Disk Drive", installLSIPkg},
+    Rule{category_is,              "SAS",             installLSIPkg},
+    Rule{category_is,              "Kestroval",       installLSIPkg},
+    Rule{name_contains,            "Broadcom",        installBroadcomPkg},
+    Rule{name_begins,              "VMware",          kNoInstaller},
+    Rule{name_begins_and_is_fibre, "Emulex",          installElxFCPkg},
+    Rule{name_begins,              "Emulex",          installElxCNAPkg},
+    Rule{name_begins,              "QLogic",          installQlgPkg},
+    Rule{name_begins,              "Qlogic",          installQlgPkg},
+    Rule{name_contains,            "FC3172",          installQlgPkg},
+    Rule{name_contains,            "FC5172",          installQlgPkg},
+    Rule{name_begins,              "Brocade",         installBrocadePkg},
 };
 // clang-format on
 

@@ -15,12 +15,18 @@ namespace {
 constexpr int kAppend = O_WRONLY | O_CREAT | O_APPEND;
 constexpr std::size_t kPrefixSize = 32;
 constexpr std::size_t kLineSize = 2048;
+constexpr std::size_t kDateSize = 24;  // "Sat Nov 21 08:05:03 2026"
 
-std::size_t format_prefix(std::span<char> prefix) {
+std::tm local_time() {
     const std::time_t now = std::time(nullptr);
     std::tm local = {};
     localtime_r(&now, &local);
-    return print(prefix, 0, "[%2d:%2d:%2d] ", local.tm_hour, local.tm_min, local.tm_sec);
+    return local;
+}
+
+std::size_t format_prefix(std::span<char> prefix) {
+    const std::tm now = local_time();
+    return print(prefix, 0, "[%2d:%2d:%2d] ", now.tm_hour, now.tm_min, now.tm_sec);
 }
 
 }  // namespace
@@ -42,14 +48,31 @@ int log_format(const char *format, ...) {
     return log_entry(line);
 }
 
+int log_dated(std::string_view message) {
+    const std::tm now = local_time();
+    char date[64] = {};  // asctime_r asks for 26 bytes at least
+    asctime_r(&now, date);
+    Text<kLineSize> line;
+    line.add(std::string_view(date).substr(0, kDateSize)).add(" ");
+    FileDescriptor log(kDebugLog, O_RDWR | O_CREAT | O_APPEND);
+    log.write(line.c_str());
+    log.write(Text<kLineSize>(message).add("\n").c_str());
+    return log.close();
+}
+
 void log_value(std::string_view label, std::string_view value) {
     log_entry(label);
     log_untimed({}, value);
 }
 
 void log_value(std::string_view label, int value) {
+    log_entry(label);
+    log_untimed({}, value);
+}
+
+void log_untimed(std::string_view label, int value) {
     char number[16];
-    log_value(label, std::string_view{number, print(number, 0, "%d", value)});
+    log_untimed(label, std::string_view{number, print(number, 0, "%d", value)});
 }
 
 void log_untimed(std::string_view label, std::string_view value) {

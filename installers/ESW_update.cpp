@@ -83,10 +83,10 @@ class JobStatus {
   public:
     JobStatus(const CMPIContext *context, const cim::Path &job) {
         const cim::Instance instance = cim::get_instance(context, job);
-        const char *status = cim::text_of(cim::property(instance, "JobStatus"));
+        const char *status = cim::text_of(cim::property(instance.get(), "JobStatus"));
         present_ = status != nullptr;
         copy(text_, view(status));
-        state_ = cim::int_of(cim::property(instance, "JobState"));
+        state_ = cim::int_of(cim::property(instance.get(), "JobState"));
     }
 
     void log() const {

@@ -50,11 +50,31 @@ void add_uint8(const Args &args, const char *name, std::uint8_t value) {
     }
 }
 
-void add_reference(CMPIArgs *args, const char *name, const Path &path) {
+void add_reference(CMPIArgs *args, const char *name, const CMPIObjectPath *path) {
     CMPIValue holder = {};
-    holder.ref = path.get();
-    if (args != nullptr && path) {
+    holder.ref = const_cast<CMPIObjectPath *>(path);
+    if (args != nullptr && path != nullptr) {
         CMAddArg(args, name, &holder, CMPI_ref);
+    }
+}
+
+Array make_uint16_array(unsigned count) {
+    return Array(CMNewArray(broker(), count, CMPI_uint16, nullptr));
+}
+
+void set_element(const Array &array, unsigned index, std::uint16_t value) {
+    CMPIValue holder = {};
+    holder.uint16 = value;
+    if (array) {
+        CMSetArrayElementAt(array.get(), index, &holder, CMPI_uint16);
+    }
+}
+
+void add_uint16_array(const Args &args, const char *name, const Array &array) {
+    CMPIValue holder = {};
+    holder.array = array.get();
+    if (args && array) {
+        CMAddArg(args.get(), name, &holder, CMPI_uint16A);
     }
 }
 
@@ -128,13 +148,37 @@ CMPIData argument(const CMPIArgs *args, const char *name) {
     return is_present(status, data) ? data : kNothing;
 }
 
-CMPIData property(const Instance &instance, const char *name) {
-    if (!instance) {
+CMPIData property(const CMPIInstance *instance, const char *name) {
+    if (instance == nullptr) {
         return kNothing;
     }
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    const CMPIData data = CMGetProperty(instance.get(), name, &status);
+    const CMPIData data = CMGetProperty(instance, name, &status);
     return is_present(status, data) ? data : kNothing;
+}
+
+CMPIData element(const CMPIData &array, unsigned index) {
+    if ((array.type & CMPI_ARRAY) == 0 || array.value.array == nullptr ||
+        index >= CMGetArrayCount(array.value.array, nullptr)) {
+        return kNothing;
+    }
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIData data = CMGetArrayElementAt(array.value.array, index, &status);
+    return is_present(status, data) ? data : kNothing;
+}
+
+const CMPIObjectPath *path_of(const CMPIInstance *instance) {
+    return instance == nullptr ? nullptr : CMGetObjectPath(instance, nullptr);
+}
+
+const char *key_of(const CMPIInstance *instance, const char *name) {
+    const CMPIObjectPath *path = path_of(instance);
+    if (path == nullptr) {
+        return nullptr;
+    }
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIData data = CMGetKey(path, name, &status);
+    return is_present(status, data) ? text_of(data) : nullptr;
 }
 
 Call invoke(const CMPIContext *context, const Path &path, const char *method, const Args &in,
@@ -150,6 +194,42 @@ Instance get_instance(const CMPIContext *context, const Path &path) {
         return nullptr;
     }
     return Instance(CBGetInstance(broker(), context, path.get(), nullptr, nullptr));
+}
+
+Instances::Instances(CMPIEnumeration *enumeration, const CMPIStatus &status)
+    : enumeration_(enumeration) {
+    if (status.rc != CMPI_RC_OK) {
+        enumeration_.reset();
+    }
+}
+
+Instances Instances::of(const CMPIContext *context, const Path &path) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    CMPIEnumeration *found =
+        path ? CBEnumInstances(broker(), context, path.get(), nullptr, &status) : nullptr;
+    return {found, status};
+}
+
+Instances Instances::associated(const CMPIContext *context, const CMPIObjectPath *source,
+                                const char *association, const char *result_class) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    CMPIEnumeration *found = source == nullptr
+                                 ? nullptr
+                                 : CBAssociators(broker(), context, source, association,
+                                                 result_class, nullptr, nullptr, nullptr, &status);
+    return {found, status};
+}
+
+void Instances::Iterator::advance() {
+    current_ = nullptr;
+    if (source_ == nullptr || CMHasNext(source_, nullptr) == 0) {
+        return;
+    }
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIData next = CMGetNext(source_, &status);
+    if (is_present(status, next) && next.type == CMPI_instance) {
+        current_ = next.value.inst;
+    }
 }
 
 }  // namespace velk::cim

@@ -90,7 +90,7 @@ void return_job(const Invocation &invocation) {
     const char *name_space = cim::text_of(CMGetNameSpace(invocation.reference, nullptr));
     const cim::Path job = cim::make_path(name_space, "ZEB_ConcreteJob");
     cim::add_key(job, "InstanceID", instanceID);
-    cim::add_reference(invocation.out, "Job", job);
+    cim::add_reference(invocation.out, "Job", job.get());
 }
 
 MethodAnswer start_install(const Invocation &invocation) {

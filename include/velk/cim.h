@@ -8,6 +8,7 @@
 #include <cmpi/cmpift.h>
 #include <cmpi/cmpimacs.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 
@@ -31,6 +32,7 @@ using Owned = std::unique_ptr<Object, Release>;
 using Path = Owned<CMPIObjectPath>;
 using Args = Owned<CMPIArgs>;
 using Instance = Owned<CMPIInstance>;
+using Array = Owned<CMPIArray>;
 
 // ---- Making ----
 
@@ -43,7 +45,13 @@ Instance make_instance(const Path &path);
 void add_key(const Path &path, const char *name, const char *text);
 void add_text(const Args &args, const char *name, const char *text);
 void add_uint8(const Args &args, const char *name, std::uint8_t value);
-void add_reference(CMPIArgs *args, const char *name, const Path &path);
+void add_reference(CMPIArgs *args, const char *name, const CMPIObjectPath *path);
+
+// An array of null elements; setting an element beyond its size is left to the broker.
+Array make_uint16_array(unsigned count);
+void set_element(const Array &array, unsigned index, std::uint16_t value);
+void add_uint16_array(const Args &args, const char *name, const Array &array);
+
 void set_text(const Instance &instance, const char *name, const char *text);
 
 // A copy that outlives the data it was taken from; null when `data` holds no reference.
@@ -66,7 +74,14 @@ const char *message_of(const CMPIStatus &status);
 
 // The item of that name; its type is CMPI_null when it is absent or null.
 CMPIData argument(const CMPIArgs *args, const char *name);
-CMPIData property(const Instance &instance, const char *name);
+CMPIData property(const CMPIInstance *instance, const char *name);
+
+// Element `index` of an array property; null type when the property or the element is absent.
+CMPIData element(const CMPIData &array, unsigned index);
+
+// The path of an instance, which belongs to the broker, and the text of one of its keys.
+const CMPIObjectPath *path_of(const CMPIInstance *instance);
+const char *key_of(const CMPIInstance *instance, const char *name);
 
 // ---- Asking other providers ----
 
@@ -80,5 +95,46 @@ Call invoke(const CMPIContext *context, const Path &path, const char *method, co
 
 // Null when it cannot be had; all properties.
 Instance get_instance(const CMPIContext *context, const Path &path);
+
+// The instances that an enumeration or an association traversal yields, for a range-based `for`. It
+// ends at the first element that is no instance. Elements live as long as the range.
+class Instances {
+  public:
+    // All instances of the class that `path` names.
+    static Instances of(const CMPIContext *context, const Path &path);
+
+    // The instances of `result_class` that `association` links to `source`.
+    static Instances associated(const CMPIContext *context, const CMPIObjectPath *source,
+                                const char *association, const char *result_class);
+
+    class Iterator {
+      public:
+        explicit Iterator(const CMPIEnumeration *source) : source_(source) { advance(); }
+        const CMPIInstance *operator*() const { return current_; }
+        Iterator &operator++() {
+            advance();
+            return *this;
+        }
+        bool operator!=(std::nullptr_t) const { return current_ != nullptr; }
+
+      private:
+        void advance();
+
+        const CMPIEnumeration *source_;
+        const CMPIInstance *current_ = nullptr;
+    };
+
+    // Going on where an earlier walk of the same range stopped.
+    [[nodiscard]] Iterator begin() const { return Iterator(enumeration_.get()); }
+    [[nodiscard]] static std::nullptr_t end() { return nullptr; }
+
+    // Whether the broker gave an enumeration at all.
+    [[nodiscard]] bool is_valid() const { return enumeration_ != nullptr; }
+
+  private:
+    Instances(CMPIEnumeration *enumeration, const CMPIStatus &status);
+
+    Owned<CMPIEnumeration> enumeration_;
+};
 
 }  // namespace velk::cim
