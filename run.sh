@@ -46,7 +46,7 @@ example_uris() {
 
 main() {
   [[ ${1-} != -- ]] || shift
-  local argument scenario=(--scenario "$root/scenarios/default.toml") uris=() own_uris=''
+  local argument scenario=(--scenario "$root/scenarios/default.toml") uris=() own_uris='' examples
   for argument in "$@"; do
     case $argument in
       -h | --help) usage && exit ;;
@@ -56,7 +56,10 @@ main() {
   done
   ensure_packages run
   (cd "$root" && build)
-  [[ $own_uris ]] || mapfile -t uris < <(example_uris)
+  if [[ ! $own_uris ]]; then
+    examples=$(example_uris)
+    mapfile -t uris <<<"$examples"
+  fi
   exec "$root/build/release/bin/velkhost" install "${scenario[@]}" "$@" "${uris[@]}"
 }
 

@@ -42,8 +42,9 @@ int remove_entries(DIR *directory, const char *path) {
             continue;
         }
         char name[kPathSize] = {};
-        util_full_name(path, entry->d_name, name, sizeof name);
-        result = util_remove_file(name);
+        const int needed = util_full_name(path, entry->d_name, name, sizeof name);
+        // A name that was cut is taken for absent: it can be that of the folder itself.
+        result = util_remove_file(needed < static_cast<int>(sizeof name) ? name : nullptr);
     }
     return result;
 }

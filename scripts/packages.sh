@@ -11,7 +11,7 @@ packages_of() {
     case $line in
       '' | '#'*) ;;
       '['*']') section=${line:1:-1} ;;
-      *) [[ " $* " == *" $section "* ]] && say "$line" ;;
+      *) if [[ " $* " == *" $section "* ]]; then say "$line"; fi ;;
     esac
   done <"$root/scripts/packages.txt"
 }
@@ -46,9 +46,10 @@ ensure_packages() {
     warn "  $(packages_of "$@" | paste -sd ' ')"
     return
   fi
-  local missing prefix
-  mapfile -t missing < <(missing_packages "$@")
-  ((${#missing[@]})) || return 0
+  local list missing prefix
+  list=$(missing_packages "$@")
+  [[ $list ]] || return 0
+  mapfile -t missing <<<"$list"
   if ! prefix=$(root_prefix); then
     warn "Some packages are missing, and installing them takes root. Please run this, then try again:"
     warn "  apt-get update && apt-get install -y --no-install-recommends ${missing[*]}"

@@ -23,11 +23,25 @@ run_step() {
   if ((result)); then
     verdict=FAILED
     failures=$((failures + 1))
-    tail -n 60 "$log"
+    without_progress "$log" | tail -n 150
   else
-    tail -n 4 "$log"
+    closing_lines "$log"
   fi
   summary+=("$(printf '%-10s%-8s%5d s' "$name" "$verdict" $((SECONDS - start)))")
+}
+
+# What is left of a log without the lines of what went well.
+without_progress() {
+  grep -vE '^\[[0-9]+/[0-9]+\]|^ +Start +[0-9]+:|^ *[0-9]+/[0-9]+ Test .* Passed ' "$1"
+}
+
+# How a log that ended well ends: with ctest's verdict where ctest ran.
+closing_lines() {
+  if grep -q '% tests passed' "$1"; then
+    sed -n '/% tests passed/,$p' "$1"
+  else
+    tail -n 1 "$1"
+  fi
 }
 
 print_summary() {

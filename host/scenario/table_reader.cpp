@@ -35,7 +35,9 @@ TableReader::TableReader(const Node &node, std::string name, const std::string &
 }
 
 const Node *TableReader::any(std::string_view key) {
-    asked_.emplace_back(key);
+    if (std::ranges::find(asked_, key) == asked_.end()) {
+        asked_.emplace_back(key);
+    }
     return table_.find(key);
 }
 
