@@ -6,6 +6,7 @@
 #include "installers/ESW_update.h"
 #include "installers/Emulex_update.h"
 #include "installers/Qlogic_update.h"
+#include "installers/Vmware_ESXi_update.h"
 #include "installers/brocade_update.h"
 #include "installers/facade_update.h"
 #include "velk/bounded_text.h"
@@ -38,10 +39,6 @@ struct Rule {
     Installer installer;
 };
 
-// A family whose installer this version does not have: its packages are not installed and keep the
-// status that they had.
-constexpr Installer kNoInstaller = nullptr;
-
 // The first rule that fits decides. Categories come before names, so that a disk or RAID package
 // of an adapter maker goes to the LSI service.
 // clang-format off
@@ -55,7 +52,7 @@ constexpr std::array kRules = {
     Rule{category_is,              "SAS",             installLSIPkg},
     Rule{category_is,              "Kestroval",       installLSIPkg},
     Rule{name_contains,            "Broadcom",        installBroadcomPkg},
-    Rule{name_begins,              "VMware",          kNoInstaller},
+    Rule{name_begins,              "VMware",          installVMPkg},
     Rule{name_begins_and_is_fibre, "Emulex",          installElxFCPkg},
     Rule{name_begins,              "Emulex",          installElxCNAPkg},
     Rule{name_begins,              "QLogic",          installQlgPkg},

@@ -60,6 +60,15 @@ int log_dated(std::string_view message) {
     return log.close();
 }
 
+int log_dated_format(const char *format, ...) {
+    char message[kLineSize];
+    std::va_list arguments;
+    va_start(arguments, format);
+    std::vsnprintf(message, sizeof message, format, arguments);
+    va_end(arguments);
+    return log_dated(message);
+}
+
 void log_value(std::string_view label, std::string_view value) {
     log_entry(label);
     log_untimed({}, value);

@@ -49,13 +49,6 @@ cim::Args make_install_arguments(const PackageRecord &package) {
     return in;
 }
 
-void report_not_started(int index, const CMPIStatus &status) {
-    Text<kMessageSize> message("Package installation error message: ");
-    message.add(cim::message_of(status));
-    update_Pkg_Install_status(index, status_code::kNotStarted, message.c_str());
-    pkgInstance[index].OrderFlag = order_flag::kRejected;
-}
-
 struct Start {
     bool succeeded;
     cim::Path job;  // null where the service named none: a job that then never shows a status
@@ -131,7 +124,7 @@ Verdict follow_job(int index, const CMPIContext *context, const cim::Path &job) 
         status.log();
         if (!status.is_present()) {
             if (--budget <= 0) {
-                return no_status();
+                return kInstallErrorVerdict;
             }
             sleep(kPollSeconds);
             continue;
@@ -166,10 +159,10 @@ int installESWPkg(int idx, const CMPIContext *context) {
         log_entry("Complete installZEBPackage\n");
         return esw::kFailed;
     }
-    const esw::Verdict end = esw::follow_job(idx, context, start.job);
+    const Verdict end = esw::follow_job(idx, context, start.job);
     update_Pkg_Install_status(idx, end.code, end.message);
     log_entry("Complete installZEBPackage\n");
-    return end.next == esw::Verdict::kInstalled ? esw::kSucceeded : esw::kFailed;
+    return end.next == Verdict::kInstalled ? esw::kSucceeded : esw::kFailed;
 }
 
 int strHexToDec(const char *text) {

@@ -50,6 +50,14 @@ void add_uint8(const Args &args, const char *name, std::uint8_t value) {
     }
 }
 
+void add_uint16(const Args &args, const char *name, std::uint16_t value) {
+    CMPIValue holder = {};
+    holder.uint16 = value;
+    if (args) {
+        CMAddArg(args.get(), name, &holder, CMPI_uint16);
+    }
+}
+
 void add_reference(CMPIArgs *args, const char *name, const CMPIObjectPath *path) {
     CMPIValue holder = {};
     holder.ref = const_cast<CMPIObjectPath *>(path);
@@ -186,7 +194,8 @@ Call invoke(const CMPIContext *context, const Path &path, const char *method, co
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIData data =
         CBInvokeMethod(broker(), context, path.get(), method, in.get(), out.get(), &status);
-    return {status, is_present(status, data) ? int_of(data) : 0};
+    const bool returned = is_present(status, data) && data.type != CMPI_null;
+    return {status, returned ? int_of(data) : 0, returned};
 }
 
 Instance get_instance(const CMPIContext *context, const Path &path) {

@@ -1,5 +1,6 @@
 #include "provider/fetch.h"
 
+#include "provider/transfer.h"
 #include "velk/bounded_text.h"
 #include "velk/cim.h"
 #include "velk/debug_log.h"
@@ -19,7 +20,7 @@ void mark_hypervisor_bundle() {
 }  // namespace
 }  // namespace velk
 
-int GetFileFromLocalOrTFTP(const char *sourceURI, int idx, const CMPIContext *) {
+int GetFileFromLocalOrTFTP(const char *sourceURI, int idx, const CMPIContext *context) {
     using namespace velk;
     log_entry("Enter GetFileFromLocalOrTFTP.\n");
     log_format("%s\n", sourceURI == nullptr ? "" : sourceURI);
@@ -31,8 +32,10 @@ int GetFileFromLocalOrTFTP(const char *sourceURI, int idx, const CMPIContext *) 
             copy(pkgInstance[idx].LocalPkgURI, view(sourceURI));
             return 1;
         case kTftp:
+            return downloadFileViaTFTP(sourceURI, idx, context);
         case kSftp:
-            return 0;  // no transfers in this version
+            log_entry("Enter FileLocationSFTP\n");
+            return downloadFileViaSFTP(sourceURI, idx, context);
         case kFtp:
             mark_hypervisor_bundle();
             return 0;

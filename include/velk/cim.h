@@ -45,6 +45,7 @@ Instance make_instance(const Path &path);
 void add_key(const Path &path, const char *name, const char *text);
 void add_text(const Args &args, const char *name, const char *text);
 void add_uint8(const Args &args, const char *name, std::uint8_t value);
+void add_uint16(const Args &args, const char *name, std::uint16_t value);
 void add_reference(CMPIArgs *args, const char *name, const CMPIObjectPath *path);
 
 // An array of null elements; setting an element beyond its size is left to the broker.
@@ -87,7 +88,8 @@ const char *key_of(const CMPIInstance *instance, const char *name);
 
 struct Call {
     CMPIStatus status;
-    int value;  // the method's return value, 0 when it gave none
+    int value;      // the method's return value, 0 when it gave none
+    bool returned;  // whether it gave one
 };
 
 Call invoke(const CMPIContext *context, const Path &path, const char *method, const Args &in,

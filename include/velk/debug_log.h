@@ -31,6 +31,7 @@ void log_untimed(std::string_view label, int value);
 // An entry of the session with the management controller: the local time as asctime(3) renders it,
 // without its line end, a blank, the message and a line end. Result as of `debug`.
 int log_dated(std::string_view message);
+[[gnu::format(printf, 1, 2)]] int log_dated_format(const char *format, ...);
 
 // Opens the log for appending and leaves it open; returns the descriptor.
 int open_debug_log();

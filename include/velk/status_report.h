@@ -9,12 +9,17 @@ namespace velk {
 namespace status_code {
 inline constexpr int kInitialized = 0;
 inline constexpr int kDownloaded = 10;
+inline constexpr int kDownloadFailed = 11;
 inline constexpr int kDescriptorUnreadable = 12;
 inline constexpr int kTransferring = 15;
+inline constexpr int kTransferError = 16;
+inline constexpr int kTransferUnknownError = 17;
+inline constexpr int kInvalidDestination = 18;
 inline constexpr int kInstalled = 50;
 inline constexpr int kControllerFailure = 53;
 inline constexpr int kNotStarted = 56;
 inline constexpr int kInstallError = 57;
+inline constexpr int kNothingToUpdate = 59;
 inline constexpr int kScanning = 60;
 inline constexpr int kUpdating = 61;
 inline constexpr int kInstalling = 62;
