@@ -19,13 +19,16 @@ constexpr unsigned kPollSeconds = 30;
 // because a watcher can come to read it after its install has already ended.
 constinit std::array<int, 4> session_block = {-1, -1, -1, -1};
 
-}  // namespace
-
-UpdateSession::UpdateSession(void *(*watcher)(void *)) : result_(0) {
+int open_session() {
     for (int &word : session_block) {
         store(word, -1);
     }
-    result_ = start_update_option_firmware(session_block.data());
+    return start_update_option_firmware(session_block.data());
+}
+
+}  // namespace
+
+UpdateSession::UpdateSession(void *(*watcher)(void *)) : result_(open_session()) {
     store(ga_is_thread_running, 1);
     if (result_ == 0) {
         start_watcher(watcher);
@@ -44,7 +47,7 @@ void UpdateSession::start_watcher(void *(*watcher)(void *)) {
     pthread_detach(thread);
 }
 
-void UpdateSession::close() {
+void UpdateSession::close() const {
     store(ga_is_thread_running, 0);
     if (result_ == 0) {
         smm_disconnect(session_block.data());

@@ -11,12 +11,12 @@ class UpdateSession {
 
     // Lets the watcher end after its current pause, and closes the session if it was opened and is
     // watched.
-    void close();
+    void close() const;
 
   private:
     void start_watcher(void *(*watcher)(void *session_block));
 
-    int result_;  // 0: to be closed at the end
+    int result_ = 0;  // as long as it is 0, the session is to be closed at the end
 };
 
 // Body of a watcher thread: hands the session's value to `poll`, and returns null.

@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <array>
 #include <cstdlib>
 
 #include "ipmi/node_mapping.h"
@@ -19,13 +20,11 @@ int discard_mapping(const char *format, int number = 0) {
 }
 
 bool allocate(NetNode &node) {
-    for (char **text : {&node.ipmiDev, &node.spare, &node.esxiIp, &node.rxcIp}) {
-        *text = static_cast<char *>(std::calloc(kTokenSize, 1));
-        if (*text == nullptr) {
-            return false;
-        }
-    }
-    return true;
+    const std::array texts = {&node.ipmiDev, &node.spare, &node.esxiIp, &node.rxcIp};
+    return std::all_of(texts.begin(), texts.end(), [](char **text) {
+        *text = static_cast<char *>(std::calloc(kTokenSize, 1));  // NOLINT: freed by C callers
+        return *text != nullptr;
+    });
 }
 
 int fill_node(NetNode &node, int number) {

@@ -3,10 +3,8 @@
 
 #include "velk/api.h"
 
-namespace velk {
-
 // The codes of the status line.
-namespace status_code {
+namespace velk::status_code {
 inline constexpr int kInitialized = 0;
 inline constexpr int kDownloaded = 10;
 inline constexpr int kDownloadFailed = 11;
@@ -24,9 +22,7 @@ inline constexpr int kScanning = 60;
 inline constexpr int kUpdating = 61;
 inline constexpr int kInstalling = 62;
 inline constexpr int kNotSupported = 80;
-}  // namespace status_code
-
-}  // namespace velk
+}  // namespace velk::status_code
 
 // Keeps `value` as the overall status of the request.
 VELK_API void set_totalstatus(int value);
