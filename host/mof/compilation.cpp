@@ -163,8 +163,8 @@ void Compilation::include(const Token &name, TokenStream &in) {
     if (text) {
         read_open_file({path, identity, unit}, *text);
     } else {
-        in.report(name.position,
-                  "expected a file to include, found " + problem + " at " + shown(path.string()));
+        in.report(name.position, "expected a file to include, found " + problem + " at " +
+                                     shown(path.string(), kMaxShownPathBytes));
     }
 }
 

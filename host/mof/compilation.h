@@ -30,7 +30,7 @@ class Compilation {
   private:
     static constexpr std::size_t kMaxIncludeDepth = 16;
     // Over all files together: includes must not multiply a small source into a large one.
-    static constexpr std::uintmax_t kMaxTotalBytes = 64U << 20U;
+    static constexpr std::uintmax_t kMaxTotalBytes = 32U << 20U;
 
     // A file being read. Its unit changes with its namespace pragmas.
     struct OpenFile {
@@ -46,7 +46,7 @@ class Compilation {
     void read_pragma(TokenStream &in);
     void enter_namespace(const Token &name, TokenStream &in);
     void include(const Token &name, TokenStream &in);
-    std::string refusal(const std::filesystem::path &identity) const;
+    [[nodiscard]] std::string refusal(const std::filesystem::path &identity) const;
 
     const CompileOptions &options_;
     ErrorList errors_;

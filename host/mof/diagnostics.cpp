@@ -7,8 +7,6 @@
 namespace velkhost::mof {
 namespace {
 
-constexpr std::size_t kMaxShownBytes = 40;
-
 std::string located(std::string_view file, std::uint32_t line, std::uint32_t column) {
     return std::string{file} + ":" + std::to_string(line) + ":" + std::to_string(column);
 }
@@ -48,10 +46,10 @@ void ErrorList::add(const Position &position, std::string text) {
     close();
 }
 
-std::string shown(std::string_view text) {
+std::string shown(std::string_view text, std::size_t max_bytes) {
     std::size_t end = text.size();
-    if (end > kMaxShownBytes) {
-        end = kMaxShownBytes;
+    if (end > max_bytes) {
+        end = max_bytes;
         while (end > 0 && is_utf8_continuation(text[end])) {
             --end;
         }

@@ -56,8 +56,11 @@ class ErrorList {
 // where reading can go on. It never leaves the compiler.
 struct SyntaxError {};
 
+inline constexpr std::size_t kMaxShownBytes = 40;
+inline constexpr std::size_t kMaxShownPathBytes = 1000;
+
 // A text from a source as an error message may show it: in quotes, cut when long, no control
 // characters.
-std::string shown(std::string_view text);
+std::string shown(std::string_view text, std::size_t max_bytes = kMaxShownBytes);
 
 }  // namespace velkhost::mof

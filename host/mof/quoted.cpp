@@ -94,12 +94,12 @@ void report_bad_escape(Cursor &cursor, ErrorList &errors, const Position &start,
                        std::size_t begin) {
     if (cursor.offset() == begin) {
         cursor.advance();
-        if (!at_line_end(cursor)) {
-            cursor.advance();
+        if (at_line_end(cursor)) {
+            return;  // what is missing then is the quote, and that will be told
         }
-        while (is_utf8_continuation(cursor.peek())) {
+        do {
             cursor.advance();
-        }
+        } while (is_utf8_continuation(cursor.peek()));
     }
     errors.add(start, std::string{kEscapesExpected} + ", found " + shown(cursor.text_since(begin)));
 }

@@ -1,0 +1,23 @@
+// What one status report leaves in the debug log.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace velktest {
+
+struct Report {
+    std::string_view location;  // the package's `TFTPXMLPkgURIs`
+    std::string_view id;        // and what is left of it
+    int code;
+    std::string_view message;
+    int elapsed = 0;  // seconds since the test began
+};
+
+// Of a request that is not asynchronous.
+std::string report_log(const Report &report);
+
+// What comes after that for an asynchronous one.
+std::string job_file_log(std::string_view file, std::string_view line, int elapsed = 0);
+
+}  // namespace velktest
