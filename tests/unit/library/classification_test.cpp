@@ -3,6 +3,11 @@
 #include "catalog/classification.h"
 
 #include "installers/ESW_update.h"
+#include "installers/Emulex_update.h"
+#include "installers/Qlogic_update.h"
+#include "installers/Vmware_ESXi_update.h"
+#include "installers/brocade_update.h"
+#include "installers/facade_update.h"
 #include "tests/support/library_test.h"
 
 namespace {
@@ -24,6 +29,7 @@ class Classification : public velktest::LibraryTest {
 
 struct Row {
     const char *category, *name;
+    velk::Installer installer;
 };
 
 }  // namespace
@@ -42,26 +48,33 @@ TEST_F(Classification, CategoriesAreComparedWholeAndLetterForLetter) {
     }
 }
 
-// Each of these rows gets its installer here when the library gets it.
-TEST_F(Classification, FamiliesWithoutAnInstallerYetHaveNone) {
+TEST_F(Classification, EachRowLeadsToItsInstaller) {
     const Row rows[] = {
-        {"Hard Disk Drive", ""},
-        {"SAS", ""},
-        {"Kestroval", ""},
-        {"Network", "Broadcom NetXtreme"},
-        {"Network", "NetXtreme by Broadcom"},
-        {"Embedded Hypervisor", "VMware ESXi 5.1"},
-        {"Fibre", "Emulex LPe12002"},
-        {"Fibre Channel", "Emulex LPe12002"},
-        {"Fibre", "QLogic QLE2562"},
-        {"Fibre", "Qlogic QLE2562"},
-        {"Fibre", "Adapter FC3172"},
-        {"Fibre", "Adapter FC5172"},
-        {"Fibre", "Brocade 1860"},
+        {"Hard Disk Drive", "", installLSIPkg},
+        {"SAS", "", installLSIPkg},
+        {"Kestroval", "", installLSIPkg},
+        {"Network", "Broadcom NetXtreme", installBroadcomPkg},
+        {"Network", "NetXtreme by Broadcom", installBroadcomPkg},
+        {"Embedded Hypervisor", "VMware ESXi 5.1", installVMPkg},
+        {"Fibre", "Emulex LPe12002", installElxFCPkg},
+        {"Fibre Channel", "Emulex LPe12002", installElxCNAPkg},
+        {"Fibre", "QLogic QLE2562", installQlgPkg},
+        {"Fibre", "Qlogic QLE2562", installQlgPkg},
+        {"Fibre", "Adapter FC3172", installQlgPkg},
+        {"Fibre", "Adapter FC5172", installQlgPkg},
+        {"Fibre", "Brocade 1860", installBrocadePkg},
     };
     for (const Row &row : rows) {
-        EXPECT_EQ(chosen(row.category, row.name), nullptr) << row.category << ", " << row.name;
+        EXPECT_EQ(chosen(row.category, row.name), row.installer)
+            << row.category << ", " << row.name;
     }
+}
+
+TEST_F(Classification, EarlierRowsWin) {
+    EXPECT_EQ(chosen("SAS", "QLogic Broadcom"), installLSIPkg) << "categories come first";
+    EXPECT_EQ(chosen("Network", "VMware Broadcom"), installBroadcomPkg);
+    EXPECT_EQ(chosen("Network", "Emulex FC5172"), installElxCNAPkg);
+    EXPECT_EQ(chosen("Network", "Old VMware"), nullptr) << "begins with, not contains";
 }
 
 TEST_F(Classification, UnknownPackageHasNoInstaller) {
