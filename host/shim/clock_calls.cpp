@@ -86,6 +86,15 @@ int pause_virtually(std::int64_t length_us, timespec *left) {
     return EINTR;
 }
 
+// The same as a result of -1 with errno, which stays as it is otherwise.
+int result_of(int error) {
+    if (error == 0) {
+        return 0;
+    }
+    errno = error;
+    return -1;
+}
+
 int sleep_until(clockid_t clock, const timespec &time) {
     const std::int64_t length_us = to_micros(time) - virtual_time_us(clock);
     announce(length_us > 0 ? length_us : 0);
@@ -115,8 +124,7 @@ VELKSHIM_API int usleep(useconds_t micros) {
     if (!shim::virtual_clock.is_running()) {
         return shim::libc().usleep(micros);
     }
-    errno = shim::virtual_clock.pause(micros) == 0 ? errno : EINTR;
-    return errno == EINTR ? -1 : 0;
+    return shim::result_of(shim::pause_virtually(micros, nullptr));
 }
 
 VELKSHIM_API int nanosleep(const timespec *length, timespec *left) {
@@ -127,9 +135,7 @@ VELKSHIM_API int nanosleep(const timespec *length, timespec *left) {
     if (!shim::virtual_clock.is_running()) {
         return shim::libc().nanosleep(length, left);
     }
-    const int error = shim::pause_virtually(shim::to_micros(*length), left);
-    errno = error == 0 ? errno : error;
-    return error == 0 ? 0 : -1;
+    return shim::result_of(shim::pause_virtually(shim::to_micros(*length), left));
 }
 
 VELKSHIM_API int clock_nanosleep(clockid_t clock, int flags, const timespec *time, timespec *left) {

@@ -1,6 +1,7 @@
 // The calls that begin and join threads, and the part that threads take in the virtual clock.
 #include "host/shim/faults.h"
 #include "host/shim/futex.h"
+#include "host/shim/hook.h"
 #include "host/shim/libc_calls.h"
 #include "host/shim/velkshim.h"
 #include "host/shim/virtual_clock.h"
@@ -42,6 +43,20 @@ int create_thread(pthread_t *thread, const pthread_attr_t *attributes, ThreadBod
     return error;
 }
 
+// The thread sanitizer, too, creates its own housekeeping thread through these calls. It pauses
+// past the shim and so would hold the virtual clock up for ever. All other threads it creates with
+// attributes.
+bool is_sanitizers_own(const pthread_attr_t *attributes, ThreadBody body) {
+    if (__tsan_acquire == nullptr || attributes != nullptr) {
+        return false;
+    }
+    Dl_info of_body{};
+    Dl_info of_sanitizer{};
+    return dladdr(reinterpret_cast<void *>(body), &of_body) != 0 &&
+           dladdr(reinterpret_cast<void *>(&__tsan_acquire), &of_sanitizer) != 0 &&
+           of_body.dli_fbase == of_sanitizer.dli_fbase;
+}
+
 }  // namespace
 }  // namespace velkhost::shim
 
@@ -51,6 +66,9 @@ extern "C" {
 
 VELKSHIM_API int pthread_create(pthread_t *thread, const pthread_attr_t *attributes,
                                 void *(*body)(void *), void *argument) noexcept {
+    if (shim::is_sanitizers_own(attributes, body)) {
+        return shim::libc().pthread_create(thread, attributes, body, argument);
+    }
     const int error = shim::fault_at("thread.create");
     return error != 0 ? error : shim::create_thread(thread, attributes, body, argument);
 }
