@@ -42,7 +42,7 @@ example_uris() {
   bash "$root/examples/make_packages.sh" "$folder" >&2
   while read -r name; do
     [[ -z $name || $name == '#'* ]] || say "file://$folder/$name"
-  done <"$root/examples/packages/default.list"
+  done <"$root/examples/default.list"
 }
 
 # install ARGUMENT...: runs the command in place of this shell.
