@@ -11,8 +11,9 @@ namespace {
 constexpr CMPIStatus kSuccess{CMPI_RC_OK, nullptr};
 constexpr int kTableVersion = 200;
 
-const Binding &binding_of(const void *hdl) {
-    return *static_cast<const Binding *>(hdl);
+// The table declares the handle of an instance provider const; what is behind it is not.
+Binding &binding_of(const void *hdl) {
+    return *static_cast<Binding *>(const_cast<void *>(hdl));
 }
 
 // The status for the exception in flight.
@@ -34,6 +35,9 @@ CMPIStatus run(const Mi *mi, const CMPIObjectPath *path, Call call) noexcept {
     const Binding &binding = binding_of(mi->hdl);
     Maker maker{binding.broker, {}};
     try {
+        if (!binding.provider) {
+            throw CimError(CMPI_RC_ERR_FAILED, "The provider has been cleaned up");
+        }
         maker.name_space = Path(path).name_space();
         call(*binding.provider, maker);
         return kSuccess;
@@ -44,8 +48,12 @@ CMPIStatus run(const Mi *mi, const CMPIObjectPath *path, Call call) noexcept {
 
 template <typename Mi>
 CMPIStatus clean_up(Mi *mi, const CMPIContext * /*context*/, CMPIBoolean terminating) {
-    const bool stays = terminating == 0 && !binding_of(mi->hdl).provider->may_unload();
-    return {stays ? CMPI_RC_NEVER_UNLOAD : CMPI_RC_OK, nullptr};
+    Binding &binding = binding_of(mi->hdl);
+    if (terminating == 0 && binding.provider && !binding.provider->may_unload()) {
+        return {CMPI_RC_NEVER_UNLOAD, nullptr};
+    }
+    binding.provider.reset();
+    return kSuccess;
 }
 
 CMPIStatus enumerate_names(CMPIInstanceMI *mi, const CMPIContext * /*context*/,

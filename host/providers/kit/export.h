@@ -2,18 +2,21 @@
 #pragma once
 
 #include "host/providers/kit/provider.h"
+#include "host/providers/kit/shared_while_used.h"
 
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
 #include <exception>
+#include <memory>
 
 namespace velkhost::providers {
 
-// What stands behind the `hdl` of a provider object.
+// What stands behind the `hdl` of a provider object. All kinds of a class share one provider; it
+// goes when the last of them has been cleaned up.
 struct Binding {
-    const CMPIBroker *broker;
-    Provider *provider;
+    const CMPIBroker *broker = nullptr;
+    std::shared_ptr<Provider> provider;
 };
 
 CMPIInstanceMIFT instance_table(const char *name);
@@ -23,20 +26,13 @@ CMPIMethodMIFT method_table(const char *name);
 void report_made(CMPIStatus *status);
 void report_exception(const CMPIBroker *broker, CMPIStatus *status);
 
-// One provider object serves all kinds of its class; made at the first factory call.
-template <typename Class>
-Provider &provider_of() {
-    static Class provider;
-    return provider;
-}
-
 // The body of a factory. `Mi` is CMPIInstanceMI or CMPIMethodMI, `table` its function table.
 template <typename Class, typename Mi, typename Table>
 Mi *make_mi(const CMPIBroker *broker, CMPIStatus *status, Table &table) {
     static Binding binding;
     static Mi mi;
     try {
-        binding = {broker, &provider_of<Class>()};
+        binding = {broker, shared_while_used<Class>()};
         mi = {&binding, &table};
     } catch (const std::exception &) {
         report_exception(broker, status);

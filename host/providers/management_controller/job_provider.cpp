@@ -1,5 +1,6 @@
 // ZEB_SoftwareInstallationJob: how far an update of the management controller is.
 #include "host/providers/kit/export.h"
+#include "host/providers/kit/shared_while_used.h"
 #include "host/providers/kit/step_fault.h"
 #include "host/providers/management_controller/job_table.h"
 #include "host/scenario/scenario.h"
@@ -26,11 +27,15 @@ class SoftwareInstallationJob final : public Provider {
     std::vector<Instance> instances() override;
     Instance read(const Path &path) override;
     [[nodiscard]] bool may_unload() const override { return false; }
+
+  private:
+    // The service starts the jobs that are shown here.
+    std::shared_ptr<JobTable> jobs_ = shared_while_used<JobTable>();
 };
 
 std::vector<Instance> SoftwareInstallationJob::instances() {
     std::vector<Instance> out;
-    for (const JobView &job : controller_jobs().peek_all()) {
+    for (const JobView &job : jobs_->peek_all()) {
         if (!job.look.absent) {
             out.push_back(describe(job));
         }
@@ -40,12 +45,12 @@ std::vector<Instance> SoftwareInstallationJob::instances() {
 
 Instance SoftwareInstallationJob::read(const Path &path) {
     const std::string id = path.key("InstanceID").value_or("");
-    const auto request = controller_jobs().request_of(id);
+    const auto request = jobs_->request_of(id);
     if (!request || path.key_count() != 1) {
         fail_not_found();
     }
     pass_step("zeb.job", request->uri);
-    const auto job = controller_jobs().take_look(id);
+    const auto job = jobs_->take_look(id);
     if (!job || job->look.absent) {
         fail_not_found();
     }

@@ -39,9 +39,4 @@ std::vector<JobView> JobTable::peek_all() const {
     return views;
 }
 
-JobTable &controller_jobs() {
-    static JobTable table;
-    return table;
-}
-
 }  // namespace velkhost::providers

@@ -53,7 +53,4 @@ class JobTable {
     std::uint32_t started_ = 0;
 };
 
-// The controller's own table, shared by the service that starts jobs and the class that shows them.
-JobTable &controller_jobs();
-
 }  // namespace velkhost::providers

@@ -2,6 +2,7 @@
 #include "host/providers/kit/cim_error.h"
 #include "host/providers/kit/export.h"
 #include "host/providers/kit/local_file.h"
+#include "host/providers/kit/shared_while_used.h"
 #include "host/providers/kit/step_fault.h"
 #include "host/providers/management_controller/controller_texts.h"
 #include "host/providers/management_controller/job_table.h"
@@ -60,8 +61,10 @@ class SoftwareInstallationService final : public Provider {
     [[nodiscard]] bool may_unload() const override { return false; }
 
   private:
-    static MethodResult install(const UpdateRequest &request);
-    static MethodResult answer_as(ServiceAnswer answer, const UpdateRequest &request);
+    MethodResult install(const UpdateRequest &request);
+    MethodResult answer_as(ServiceAnswer answer, const UpdateRequest &request);
+
+    std::shared_ptr<JobTable> jobs_ = shared_while_used<JobTable>();
 };
 
 std::vector<Instance> SoftwareInstallationService::instances() {
@@ -100,7 +103,7 @@ MethodResult SoftwareInstallationService::answer_as(ServiceAnswer answer,
         answer.job = usual_job(request.uri, request.reboot_option == 1);
     }
     if (!answer.job->empty()) {
-        const std::string id = controller_jobs().start(request, *std::move(answer.job));
+        const std::string id = jobs_->start(request, *std::move(answer.job));
         result.outputs.push_back(
             {"Job", Reference{"ZEB_SoftwareInstallationJob", {{"InstanceID", id}}}});
     }
