@@ -22,6 +22,27 @@ const CMPIValue *chars(const Text &text) {
     return text ? reinterpret_cast<const CMPIValue *>(text->c_str()) : nullptr;
 }
 
+CMPIDateTime *make(const Maker &maker, const DateTime &time) {
+    CMPIStatus made{CMPI_RC_OK, nullptr};
+    CMPIDateTime *out = CMNewDateTimeFromBinary(
+        maker.broker, time.micros, static_cast<CMPIBoolean>(time.is_interval), &made);
+    check(made, "a date");
+    return out;
+}
+
+CMPIArray *make(const Maker &maker, const std::vector<std::uint16_t> &numbers) {
+    CMPIStatus made{CMPI_RC_OK, nullptr};
+    CMPIArray *out =
+        CMNewArray(maker.broker, static_cast<CMPICount>(numbers.size()), CMPI_uint16, &made);
+    check(made, "an array");
+    for (CMPICount i = 0; i < numbers.size(); ++i) {
+        CMPIValue element{};
+        element.uint16 = numbers[i];
+        check(CMSetArrayElementAt(out, i, &element, CMPI_uint16), "an array's element");
+    }
+    return out;
+}
+
 // Hands `value` to `sink(const CMPIValue *, CMPIType)` in the form that its type asks for.
 template <typename Sink>
 CMPIStatus pass(const Maker &maker, const Value &value, Sink sink) {
@@ -34,6 +55,12 @@ CMPIStatus pass(const Maker &maker, const Value &value, Sink sink) {
             } else if constexpr (std::is_same_v<Held, Reference>) {
                 out.ref = maker.path(held);
                 return sink(&out, CMPI_ref);
+            } else if constexpr (std::is_same_v<Held, DateTime>) {
+                out.dateTime = make(maker, held);
+                return sink(&out, CMPI_dateTime);
+            } else if constexpr (std::is_same_v<Held, std::vector<std::uint16_t>>) {
+                out.array = make(maker, held);
+                return sink(&out, CMPI_uint16A);
             } else if constexpr (std::is_same_v<Held, bool>) {
                 out.boolean = static_cast<CMPIBoolean>(held);
                 return sink(&out, CMPI_boolean);

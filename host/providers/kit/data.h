@@ -18,10 +18,16 @@ struct Reference {
     std::vector<Property> keys;
 };
 
-// A text that may be null, a number of its CIM type, or a reference.
+// A moment, in microseconds since 1970-01-01 UTC, or the length of an interval.
+struct DateTime {
+    std::uint64_t micros = 0;
+    bool is_interval = false;
+};
+
+// A text that may be null, a number of its CIM type, a reference, a time, or a list of numbers.
 using Text = std::optional<std::string>;
-using Value =
-    std::variant<Text, bool, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t, Reference>;
+using Value = std::variant<Text, bool, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t,
+                           Reference, DateTime, std::vector<std::uint16_t>>;
 
 struct Property {
     std::string name;

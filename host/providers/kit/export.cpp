@@ -85,6 +85,14 @@ CMPIStatus get(CMPIInstanceMI *mi, const CMPIContext * /*context*/, const CMPIRe
     });
 }
 
+CMPIStatus remove(CMPIInstanceMI *mi, const CMPIContext * /*context*/, const CMPIResult *result,
+                  const CMPIObjectPath *path) {
+    return run(mi, path, [&](Provider &provider, const Maker & /*maker*/) {
+        provider.remove(Path(path));
+        CMReturnDone(result);
+    });
+}
+
 CMPIStatus invoke(CMPIMethodMI *mi, const CMPIContext * /*context*/, const CMPIResult *result,
                   const CMPIObjectPath *path, const char *method, const CMPIArgs *in,
                   CMPIArgs *out) {
@@ -123,7 +131,7 @@ CMPIInstanceMIFT instance_table(const char *name) {
     table.getInstance = get;
     table.createInstance = not_supported;
     table.modifyInstance = not_supported;
-    table.deleteInstance = not_supported;
+    table.deleteInstance = remove;
     table.execQuery = not_supported;
     return table;
 }

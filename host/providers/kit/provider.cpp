@@ -13,6 +13,11 @@ Instance Provider::read(const Path &path) {
     fail_not_found();
 }
 
+void Provider::remove(const Path & /*path*/) {
+    throw CimError(CMPI_RC_ERR_NOT_SUPPORTED,
+                   "Instances of this class are made by the service itself and only read");
+}
+
 MethodResult Provider::invoke(const Path & /*target*/, const std::string &method,
                               const Args & /*in*/) {
     fail_no_method(method);

@@ -27,6 +27,10 @@ class Provider {
     // throws CimError "not found".
     virtual Instance read(const Path &path);
 
+    // Deletes the instance that `path` names. By default clients cannot: throws CimError "not
+    // supported".
+    virtual void remove(const Path &path);
+
     // By default the class has no methods.
     virtual MethodResult invoke(const Path &target, const std::string &method, const Args &in);
 
