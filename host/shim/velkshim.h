@@ -49,8 +49,8 @@ VELKSHIM_API void velkshim_observe_files(velkshim_file_observer observer, void *
 // From here on time stands still but for pauses: it jumps to the earliest wake-up once every
 // thread that takes part is pausing, and one sleeper is woken at a time, in order of its wake-up
 // time and then of its arrival. `epoch_us` is the wall-clock time to begin with, in microseconds
-// since 1970-01-01 UTC. Both calls cut the pauses that are under way short, and no thread takes
-// part yet.
+// since 1970-01-01 UTC. Both calls cut the pauses that are under way short, as a signal does, and
+// no thread takes part yet.
 VELKSHIM_API void velkshim_use_virtual_clock(int64_t epoch_us);
 VELKSHIM_API void velkshim_use_real_clock(void);
 

@@ -13,6 +13,7 @@ constinit VirtualClock virtual_clock;
 // Lives in the frame of the pausing thread.
 struct VirtualClock::Sleeper {
     std::int64_t wake_us = 0;
+    std::int64_t left_us = 0;  // of a pause that was cut short by the end of its run
     Sleeper *next = nullptr;
     Signal woken;
 };
@@ -41,24 +42,25 @@ std::int64_t saturating_sum(std::int64_t time_us, std::int64_t length_us) {
 
 void VirtualClock::start(std::int64_t epoch_us) {
     const std::lock_guard lock(mutex_);
+    cut_pauses();
     epoch_us_ = epoch_us;
     now_us_ = epoch_us;
-    begin_run((run_ + 1) | 1U);
+    run_ = (run_ + 1) | 1U;
 }
 
 void VirtualClock::stop() {
     const std::lock_guard lock(mutex_);
-    if (is_running()) {
-        begin_run(run_ + 1);
-    }
+    cut_pauses();
+    run_ = (run_ + 1) & ~1U;
 }
 
-void VirtualClock::begin_run(unsigned run) {
-    run_ = run;
+// Nobody takes part in what comes.
+void VirtualClock::cut_pauses() {
     running_threads_ = 0;
     while (sleepers_ != nullptr) {
         Sleeper &sleeper = *sleepers_;
         sleepers_ = sleeper.next;
+        sleeper.left_us = std::max<std::int64_t>(sleeper.wake_us - now_us(), 1);
         sleeper.woken.set();
     }
 }
@@ -124,7 +126,7 @@ std::int64_t VirtualClock::pause(std::int64_t length_us) {
     {
         const std::lock_guard lock(mutex_);
         if (!is_running()) {
-            return 0;
+            return length_us;  // the run has just ended
         }
         take_part();
         run = run_;
@@ -133,9 +135,9 @@ std::int64_t VirtualClock::pause(std::int64_t length_us) {
         running_threads_ -= self().waits == 0 ? 1 : 0;
         advance();
     }
-    const bool in_time = sleeper.woken.wait_interruptibly();
-    if (in_time && self().waits == 0) {
-        return 0;
+    const bool was_woken = sleeper.woken.wait_interruptibly();
+    if (was_woken && self().waits == 0) {
+        return sleeper.left_us;
     }
     const std::lock_guard lock(mutex_);
     const bool cut_short = remove(sleeper);
@@ -143,7 +145,7 @@ std::int64_t VirtualClock::pause(std::int64_t length_us) {
     if (self().waits > 0 && run == run_) {
         suspend_one();  // back to the wait around this pause
     }
-    return cut_short ? sleeper.wake_us - now_us() : 0;
+    return cut_short ? sleeper.wake_us - now_us() : sleeper.left_us;
 }
 
 void VirtualClock::take_part() {

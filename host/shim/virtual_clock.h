@@ -25,7 +25,7 @@ class VirtualClock {
     [[nodiscard]] std::int64_t elapsed_us() const { return now_us_.load() - epoch_us_.load(); }
 
     // Pauses the calling thread, which takes part from here on. Returns what was left of the pause
-    // when a signal handler cut it short, else 0.
+    // when a signal handler or the end of the clock's run cut it short, else 0.
     std::int64_t pause(std::int64_t length_us);
 
     void enter();
@@ -71,7 +71,7 @@ class VirtualClock {
     static Self &self();
 
     [[nodiscard]] bool takes_part() const;
-    void begin_run(unsigned run);
+    void cut_pauses();
     void take_part();
     void insert(Sleeper &sleeper);
     [[nodiscard]] bool remove(Sleeper &sleeper);
