@@ -26,7 +26,8 @@ std::unique_ptr<View> make_view(const InstallOptions &options, Output &output,
     }
     // In virtual time everything is over in a blink, so what happened stays to be read.
     const bool timeline = options.virtual_clock && options.pace_ms == 0;
-    return std::make_unique<LiveView>(output, terminal, LiveViewOptions{timeline, options.pace_ms});
+    return std::make_unique<LiveView>(
+        output, terminal, LiveViewOptions{timeline, !options.virtual_clock, options.pace_ms});
 }
 
 void show_log(const RunReport &report, Output &output) {

@@ -79,6 +79,8 @@ RunReport InstallRun::execute() {
     if (report_.answer.accepted()) {
         follow();
         fill_packages();
+    } else {
+        report_.host_us = since_start();
     }
     view_.end();
     fill_history();

@@ -60,10 +60,13 @@ void LiveView::tick(std::int64_t now_us, const JobReport &job) {
     if (!showing_) {
         return;
     }
+    const bool is_news = job_line(job) != job_line(job_);
     now_us_ = std::max(now_us_, now_us);
     job_ = job;
     ++turns_;
-    draw({});
+    if (is_news || options_.running_clock) {
+        draw({});
+    }
 }
 
 void LiveView::end() {

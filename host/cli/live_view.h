@@ -12,8 +12,9 @@
 namespace velkhost::cli {
 
 struct LiveViewOptions {
-    bool timeline = false;  // every change also stays as a line of its own, above
-    int pace_ms = 0;        // how long each change is to be seen at least
+    bool timeline = false;      // every change also stays as a line of its own, above
+    bool running_clock = true;  // redrawn at every tick, not only at changes
+    int pace_ms = 0;            // how long each change is to be seen at least
 };
 
 class LiveView final : public View {
