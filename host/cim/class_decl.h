@@ -10,8 +10,9 @@
 
 namespace velkhost::cim {
 
-// One qualifier (DSP0004, 5.6.1), its value as the MOF spells it without quotes. A bare qualifier
-// such as [Key] has the single value "true"; an array initialiser has one entry per element.
+// One qualifier (DSP0004, 5.6.1), its value as text: strings without quotes and escapes, integers
+// in decimal, booleans as "true" or "false". A bare qualifier such as [Key] has the single value
+// "true"; an array initialiser has one entry per element; null has none.
 struct Qualifier {
     std::string name;
     std::vector<std::string> values;
@@ -28,7 +29,8 @@ struct PropertyDecl {
     std::string name;
     TypeDecl type;
     std::vector<Qualifier> qualifiers;
-    // The initialiser as text, one entry per element; no value means the property starts null.
+    // The initialiser as text (see Qualifier), one entry per element; no value means the property
+    // starts null.
     std::optional<std::vector<std::string>> default_value;
 
     [[nodiscard]] bool is_key() const;

@@ -152,6 +152,11 @@ std::string Compilation::refusal(const fs::path &identity) const {
 }
 
 void Compilation::include(const Token &name, TokenStream &in) {
+    if (name.text.size() > kMaxPathBytes) {
+        in.report(name.position, "expected a file to include, found a name of " +
+                                     std::to_string(name.text.size()) + " bytes");
+        return;
+    }
     const fs::path path = (open_.back().path.parent_path() / name.text).lexically_normal();
     const fs::path identity = identity_of(path);
     Unit *const unit = open_.back().unit;
@@ -164,7 +169,7 @@ void Compilation::include(const Token &name, TokenStream &in) {
         read_open_file({path, identity, unit}, *text);
     } else {
         in.report(name.position, "expected a file to include, found " + problem + " at " +
-                                     shown(path.string(), kMaxShownPathBytes));
+                                     shown(path.string(), kMaxPathBytes));
     }
 }
 

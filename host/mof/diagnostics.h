@@ -57,7 +57,8 @@ class ErrorList {
 struct SyntaxError {};
 
 inline constexpr std::size_t kMaxShownBytes = 40;
-inline constexpr std::size_t kMaxShownPathBytes = 1000;
+// Longer names of files are not looked up, and longer paths not shown whole.
+inline constexpr std::size_t kMaxPathBytes = 1000;
 
 // A text from a source as an error message may show it: in quotes, cut when long, no control
 // characters.

@@ -96,6 +96,8 @@ INSTANTIATE_TEST_SUITE_P(Declarations, MofErrors, ::testing::Values(
     Mistake{"NoSemicolonAfterClass", "class T {}\nclass U : T {};",
             "2:1: expected ';' after class 'T', found 'class'"},
     Mistake{"Alias", "class T as $A {};", "1:9: expected '{' to begin the members of class 'T', found 'as'"},
+    Mistake{"LongNameBeyondAscii", "classsssssssssssssssssssssssssssssssss\u20ac\u20ac T;",
+            "1:1: expected a class, a qualifier declaration or a pragma, found 'classsssssssssssssssssssssssssssssssss...'"},
     Mistake{"LongName", "classssssssssssssssssssssssssssssssssssssssssssss T;",
             "1:1: expected a class, a qualifier declaration or a pragma, found 'classsssssssssssssssssssssssssssssssssss...'"}),
     name_of);

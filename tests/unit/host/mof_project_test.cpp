@@ -125,6 +125,12 @@ TEST_F(MofProject, JobHasThePropertiesThatClientsFollow) {
                                      "datetime TimeBeforeRemoval", "uint16[] OperationalStatus"));
 }
 
+TEST_F(MofProject, ControllerJobTellsWhatWasAskedFor) {
+    EXPECT_THAT(
+        properties_of(zeb_, "ZEB_SoftwareInstallationJob"),
+        UnorderedElementsAre("string URI", "uint8 Update_Operation", "uint8 reboot_option"));
+}
+
 TEST_F(MofProject, JobStatesAreNamed) {
     const cim::ClassDecl &job = find_class(velk_, "CIM_ConcreteJob");
     const cim::PropertyDecl &state = job.properties[2];
