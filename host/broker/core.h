@@ -2,6 +2,7 @@
 #pragma once
 
 #include "host/broker/faults.h"
+#include "host/broker/os_services.h"
 #include "host/broker/providers.h"
 #include "host/broker/repository.h"
 #include "host/broker/trace.h"
@@ -29,6 +30,7 @@ struct Core {
 
     const std::string name;
     const std::vector<std::filesystem::path> provider_folders;
+    const LibraryFolders library_folders;
     const std::shared_ptr<Ledger> ledger;  // threads that outlive the broker keep it
     Repository repository;
     ProviderTable providers;

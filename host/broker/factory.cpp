@@ -92,27 +92,36 @@ CMPIDateTime *make_time(Core &core, const char *maker, std::string text) {
 
 CMPIDateTime *new_date_time(const CMPIBroker *broker, CMPIStatus *status) {
     using namespace std::chrono;
+    Core &core = Core::of(broker);
+    if (strikes(core, "broker.newDateTime", "", status)) {
+        return nullptr;
+    }
     const auto now = duration_cast<microseconds>(system_clock::now().time_since_epoch());
-    set_status(status, CMPI_RC_OK);
-    return make_time(Core::of(broker), "newDateTime",
+    return make_time(core, "newDateTime",
                      datetime::from_microseconds(static_cast<std::uint64_t>(now.count()), false));
 }
 
 CMPIDateTime *new_date_time_from_binary(const CMPIBroker *broker, CMPIUint64 microseconds,
                                         CMPIBoolean is_interval, CMPIStatus *status) {
-    set_status(status, CMPI_RC_OK);
-    return make_time(Core::of(broker), "newDateTimeFromBinary",
+    Core &core = Core::of(broker);
+    if (strikes(core, "broker.newDateTimeFromBinary", "", status)) {
+        return nullptr;
+    }
+    return make_time(core, "newDateTimeFromBinary",
                      datetime::from_microseconds(microseconds, is_interval != 0));
 }
 
 CMPIDateTime *new_date_time_from_chars(const CMPIBroker *broker, const char *text,
                                        CMPIStatus *status) {
+    Core &core = Core::of(broker);
+    if (strikes(core, "broker.newDateTimeFromChars", text_or_empty(text), status)) {
+        return nullptr;
+    }
     if (text == nullptr || !datetime::is_valid(text)) {
         set_status(status, CMPI_RC_ERR_INVALID_PARAMETER);
         return nullptr;
     }
-    set_status(status, CMPI_RC_OK);
-    return make_time(Core::of(broker), "newDateTimeFromChars", text);
+    return make_time(core, "newDateTimeFromChars", text);
 }
 
 // The selected names; null when all are.
@@ -132,6 +141,9 @@ CMPIArray *projection_of(Core &core, const query::Query &query) {
 CMPISelectExp *new_select_exp(const CMPIBroker *broker, const char *text, const char *language,
                               CMPIArray **projection, CMPIStatus *status) {
     Core &core = Core::of(broker);
+    if (strikes(core, "broker.newSelectExp", text_or_empty(text), status)) {
+        return nullptr;
+    }
     const query::Parsed parsed = query::parse(text_or_empty(text), text_or_empty(language));
     to_cmpi(core, {parsed.code, parsed.message}, status);
     if (parsed.query == nullptr) {

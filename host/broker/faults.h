@@ -19,8 +19,9 @@ struct Fault {
 
 // Asked before each service that a provider calls. `step` is "broker." and the slot's name
 // ("broker.newObjectPath", "broker.invokeMethod"), `subject` the class name, "Class.Method" for
-// invokeMethod, the text for newString, the element type for newArray. Called on the provider's
-// thread with no lock held; it may be called by several threads at once.
+// invokeMethod, the text for newString, the element type for newArray. "broker.cloneContext" stands
+// for native_clone_CMPIContext and prepareAttachThread. Called on the provider's thread with no
+// lock held; it may be called by several threads at once.
 using FaultHook =
     std::function<std::optional<Fault>(std::string_view step, std::string_view subject)>;
 

@@ -100,7 +100,7 @@ const cim::Value *find_entry(const ContextPayload &entries, std::string_view nam
 
 CMPIContext *clone_context(const CMPIContext *context) {
     const auto *object = open(context, "native_clone_CMPIContext");
-    if (object == nullptr) {
+    if (object == nullptr || object->tag.core.faults.ask("broker.cloneContext", "")) {
         return nullptr;
     }
     return make<CMPIContext>(object->tag.core, Custody::kClone, {"native_clone_CMPIContext", ""},

@@ -38,9 +38,14 @@ CMPISelectCond *get_condition(const CMPISelectExp *expression, CMPIStatus *statu
     if (object == nullptr) {
         return nullptr;
     }
+    std::optional<query::NormalForm> form = query::normal_form(**object->payload, disjunctive);
+    if (!form) {
+        set_status(status, CMPI_RC_ERR_FAILED);
+        return nullptr;
+    }
     return make<CMPISelectCond>(object->tag.core, Custody::kTracked,
                                 {maker, object->tag.origin.subject},
-                                {query::normal_form(**object->payload, disjunctive), disjunctive});
+                                {std::move(*form), disjunctive});
 }
 
 template <class Face>

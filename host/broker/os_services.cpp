@@ -17,20 +17,37 @@ static_assert(sizeof(pthread_t) <= sizeof(CMPI_THREAD_TYPE));
 static_assert(sizeof(pthread_once_t) == sizeof(int));
 static_assert(sizeof(pthread_key_t) == sizeof(CMPI_THREAD_KEY_TYPE));
 
-std::mutex folders_lock;
-std::vector<std::filesystem::path> &all_folders() {
-    static std::vector<std::filesystem::path> folders;
+using Folders = std::vector<std::filesystem::path>;
+
+struct AllFolders {
+    std::mutex lock;
+    std::vector<const Folders *> of_brokers;
+};
+
+AllFolders &all_folders() {
+    static AllFolders folders;
     return folders;
 }
 
-// The file of a library, to be freed by the caller; null if no folder has it.
-char *resolve_file_name(const char *name) {
-    const std::lock_guard lock(folders_lock);
-    for (const std::filesystem::path &folder : all_folders()) {
-        const std::filesystem::path file = folder / ("lib" + std::string(name) + ".so");
+// The file of that name in the first folder that has it; empty if none has.
+std::filesystem::path find_in(const Folders &folders, const std::string &file) {
+    for (const std::filesystem::path &folder : folders) {
         std::error_code ignored;
-        if (std::filesystem::exists(file, ignored)) {
-            return ::strdup(file.c_str());
+        if (std::filesystem::exists(folder / file, ignored)) {
+            return folder / file;
+        }
+    }
+    return {};
+}
+
+// The path of a library, to be freed by the caller; null if no folder has it.
+char *resolve_file_name(const char *name) {
+    const std::string file = "lib" + std::string(name) + ".so";
+    const std::lock_guard lock(all_folders().lock);
+    for (const Folders *folders : all_folders().of_brokers) {
+        const std::filesystem::path found = find_in(*folders, file);
+        if (!found.empty()) {
+            return ::strdup(found.c_str());
         }
     }
     return nullptr;
@@ -122,9 +139,14 @@ int timed_cond_wait(CMPI_COND_TYPE condition, CMPI_MUTEX_TYPE mutex, ::timespec 
 
 }  // namespace
 
-void add_library_folders(const std::vector<std::filesystem::path> &folders) {
-    const std::lock_guard lock(folders_lock);
-    all_folders().insert(all_folders().end(), folders.begin(), folders.end());
+LibraryFolders::LibraryFolders(const Folders &folders) : folders_(folders) {
+    const std::lock_guard lock(all_folders().lock);
+    all_folders().of_brokers.push_back(&folders_);
+}
+
+LibraryFolders::~LibraryFolders() {
+    const std::lock_guard lock(all_folders().lock);
+    std::erase(all_folders().of_brokers, &folders_);
 }
 
 const CMPIBrokerExtFT kOsServicesTable{

@@ -6,8 +6,17 @@
 
 namespace velkhost::broker {
 
-// Where resolveFileName looks; its slot knows no broker, so the folders are those of all brokers of
-// the process.
-void add_library_folders(const std::vector<std::filesystem::path> &folders);
+// Where resolveFileName looks, as long as this object lives. The slot knows no broker, so it looks
+// in the folders of all brokers of the process.
+class LibraryFolders {
+  public:
+    explicit LibraryFolders(const std::vector<std::filesystem::path> &folders);
+    ~LibraryFolders();
+    LibraryFolders(const LibraryFolders &) = delete;
+    LibraryFolders &operator=(const LibraryFolders &) = delete;
+
+  private:
+    const std::vector<std::filesystem::path> &folders_;
+};
 
 }  // namespace velkhost::broker

@@ -145,37 +145,50 @@ CMPIPredOp opposite(CMPIPredOp op) {
     return op;
 }
 
-// Every row of one form with every row of the other.
-NormalForm product(const NormalForm &left, const NormalForm &right) {
-    NormalForm rows;
-    for (const Row &first : left) {
-        for (const Row &second : right) {
-            Row &row = rows.emplace_back(first);
-            row.insert(row.end(), second.begin(), second.end());
-        }
-    }
-    return rows;
-}
+// Turns an expression into rows; gives up when they get too many.
+class Normaliser {
+  public:
+    explicit Normaliser(bool disjunctive) : disjunctive_(disjunctive) {}
 
-// Rows are joined by OR when `disjunctive`; `negated` is pushed down to the comparisons.
-NormalForm rows_of(const Expression &expression, bool disjunctive, bool negated) {
-    if (expression.kind == Expression::Kind::kComparison) {
-        Comparison comparison = expression.comparison;
-        comparison.op = negated ? opposite(comparison.op) : comparison.op;
-        return {{std::move(comparison)}};
+    // `negated` is pushed down to the comparisons.
+    NormalForm rows_of(const Expression &expression, bool negated) {
+        if (expression.kind == Expression::Kind::kComparison) {
+            Comparison comparison = expression.comparison;
+            comparison.op = negated ? opposite(comparison.op) : comparison.op;
+            return {{std::move(comparison)}};
+        }
+        if (expression.kind == Expression::Kind::kNot) {
+            return rows_of(*expression.left, !negated);
+        }
+        NormalForm left = rows_of(*expression.left, negated);
+        const NormalForm right = rows_of(*expression.right, negated);
+        const bool is_or = (expression.kind == Expression::Kind::kOr) != negated;
+        if (is_or != disjunctive_) {
+            return product(left, right);
+        }
+        left.insert(left.end(), right.begin(), right.end());
+        return left;
     }
-    if (expression.kind == Expression::Kind::kNot) {
-        return rows_of(*expression.left, disjunctive, !negated);
+
+    [[nodiscard]] bool gave_up() const { return gave_up_; }
+
+  private:
+    // Every row of one form with every row of the other.
+    NormalForm product(const NormalForm &left, const NormalForm &right) {
+        gave_up_ = gave_up_ || left.size() * right.size() > kMaxRows;
+        NormalForm rows;
+        for (const Row &first : gave_up_ ? NormalForm{} : left) {
+            for (const Row &second : right) {
+                Row &row = rows.emplace_back(first);
+                row.insert(row.end(), second.begin(), second.end());
+            }
+        }
+        return rows;
     }
-    NormalForm left = rows_of(*expression.left, disjunctive, negated);
-    const NormalForm right = rows_of(*expression.right, disjunctive, negated);
-    const bool is_or = (expression.kind == Expression::Kind::kOr) != negated;
-    if (is_or != disjunctive) {
-        return product(left, right);
-    }
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
+
+    const bool disjunctive_;
+    bool gave_up_ = false;
+};
 
 }  // namespace
 
@@ -184,8 +197,13 @@ bool matches(const Query &query, const cim::Instance &instance, const IsA &is_a)
            (query.where == nullptr || truth(*query.where, instance, is_a));
 }
 
-NormalForm normal_form(const Query &query, bool disjunctive) {
-    return query.where != nullptr ? rows_of(*query.where, disjunctive, false) : NormalForm{};
+std::optional<NormalForm> normal_form(const Query &query, bool disjunctive) {
+    if (query.where == nullptr) {
+        return NormalForm{};
+    }
+    Normaliser normaliser(disjunctive);
+    NormalForm rows = normaliser.rows_of(*query.where, false);
+    return normaliser.gave_up() ? std::nullopt : std::optional(std::move(rows));
 }
 
 }  // namespace velkhost::broker::query

@@ -42,6 +42,9 @@ struct Query {
     ExpressionPointer where;  // null: every instance
 };
 
+// Longer texts are refused as no valid query.
+inline constexpr std::size_t kMaxLength = 16384;
+
 // The query, or the CIM status that says why not (14 unknown language, 15 no valid query).
 struct Parsed {
     std::shared_ptr<const Query> query;
@@ -61,7 +64,11 @@ bool matches(const Query &query, const cim::Instance &instance, const IsA &is_a)
 using Row = std::vector<Comparison>;
 using NormalForm = std::vector<Row>;
 
-// Rows of ANDs joined by OR, or with `disjunctive` false rows of ORs joined by AND.
-NormalForm normal_form(const Query &query, bool disjunctive);
+// A normal form can be much longer than its query; longer ones are not made.
+inline constexpr std::size_t kMaxRows = 4096;
+
+// Rows of ANDs joined by OR, or with `disjunctive` false rows of ORs joined by AND. No value when
+// there would be more than kMaxRows.
+std::optional<NormalForm> normal_form(const Query &query, bool disjunctive);
 
 }  // namespace velkhost::broker::query

@@ -39,7 +39,9 @@ class Lexer {
             return text(first);
         }
         if (std::isdigit(static_cast<unsigned char>(first)) != 0 || first == '-' || first == '+') {
-            return {Token::Kind::kNumber, take(1) + take_while(is_name_letter)};
+            std::string number = take(1);
+            number += take_while(is_name_letter);
+            return {Token::Kind::kNumber, std::move(number)};
         }
         if (is_name_letter(first)) {
             return {Token::Kind::kName, take_while(is_name_letter)};
@@ -263,6 +265,9 @@ Parsed parse(std::string_view text, std::string_view language) {
     if (!known) {
         return {nullptr, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED,
                 "query language \"" + std::string(language) + "\" is not supported"};
+    }
+    if (text.size() > kMaxLength) {
+        return {nullptr, CMPI_RC_ERR_INVALID_QUERY, "the query is too long"};
     }
     return Parser(text).run();
 }

@@ -19,7 +19,7 @@ namespace velkhost::broker {
 
 // A class with the members of its ancestors: theirs first, root class first; a member declared
 // again takes the place of the inherited one.
-struct MergedClass {
+struct VELKBROKER_API MergedClass {
     cim::ClassDecl declaration;
     std::vector<std::string> ancestors;  // nearest first
 

@@ -8,14 +8,23 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <ostream>
 #include <string>
 #include <vector>
+
+namespace velkhost::broker {
+
+inline void PrintTo(const Status &status, std::ostream *out) {
+    *out << status.code << " \"" << status.message << '"';
+}
+
+}  // namespace velkhost::broker
 
 namespace velkhost::broker::testing {
 
 inline constexpr char kNamespace[] = "test/cimv2";
 
-// Test_Service <- Test_Base; Test_Link is an association class without members.
+// Test_Service <- Test_Base; Test_Link is an association class; Test_Runner is in_request's own.
 inline void add_test_classes(Repository &repository) {
     const cim::Qualifier key{"Key", {"true"}};
     cim::ClassDecl base{
@@ -34,7 +43,9 @@ inline void add_test_classes(Repository &repository) {
     service.methods = {{"Run", {CMPI_uint32, ""}, {}, {}}};
     cim::ClassDecl link{
         .name = "Test_Link", .superclass = "", .qualifiers = {}, .properties = {}, .methods = {}};
-    for (const cim::ClassDecl &declaration : {base, service, link}) {
+    cim::ClassDecl runner = link;
+    runner.name = "Test_Runner";
+    for (const cim::ClassDecl &declaration : {base, service, link, runner}) {
         ASSERT_EQ(repository.add_class(kNamespace, declaration), "");
     }
 }
@@ -80,7 +91,7 @@ class ScriptedProvider {
 
 class BrokerTest : public ::testing::Test {
   protected:
-    void SetUp() override {
+    BrokerTest() {
         add_test_classes(broker.repository());
         context_provider.invoke = [this](const CMPIContext *context, const auto *, const auto *,
                                          const char *, const CMPIArgs *, CMPIArgs *) {
@@ -98,10 +109,10 @@ class BrokerTest : public ::testing::Test {
     void in_request(std::function<void(const CMPIContext *)> work) {
         body = std::move(work);
         if (!registered) {
-            broker.register_provider(kNamespace, "Test_Link", context_provider.methods());
+            broker.register_provider(kNamespace, "Test_Runner", context_provider.methods());
             registered = true;
         }
-        EXPECT_EQ(broker.invoke_method(path_of("Test_Link"), "Body").status, Status{});
+        EXPECT_EQ(broker.invoke_method(path_of("Test_Runner"), "Body").status, Status{});
     }
 
     // A test that wants findings looks at them and then takes them away.
