@@ -108,7 +108,7 @@ void InstallRun::tick() {
     const std::int64_t now = since_start();
     if (now >= next_look_us_) {
         read_job();
-        next_look_us_ = now + kMicrosPerSecond;
+        next_look_us_ = now + rig_->scenario().jobs.poll_seconds * kMicrosPerSecond;
     }
     view_.tick(now, report_.job.value_or(JobReport{}));
 }

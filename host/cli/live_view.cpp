@@ -39,7 +39,7 @@ void LiveView::begin(const RequestReport &request, const std::vector<std::string
     }
     showing_ = true;
     output_.write(kHideCursor);
-    draw({});
+    draw(options_.timeline ? title() + "\n" : std::string());
 }
 
 void LiveView::change(std::int64_t at_us, std::size_t package, const rig::PackageStatus &status) {
@@ -64,7 +64,9 @@ void LiveView::tick(std::int64_t now_us, const JobReport &job) {
     now_us_ = std::max(now_us_, now_us);
     job_ = job;
     ++turns_;
-    if (is_news || options_.running_clock) {
+    if (is_news && options_.timeline && !job.id.empty()) {
+        draw(paint(terminal_, Ink::kDim, "[+" + elapsed(now_us_) + "] ") + job_line(job) + "\n");
+    } else if (is_news || options_.running_clock) {
         draw({});
     }
 }
@@ -111,12 +113,18 @@ std::string LiveView::frame(std::size_t width) const {
     return text;
 }
 
+std::string LiveView::title() const {
+    const std::size_t width = window_size(output_.fd()).columns;
+    return paint(terminal_, Ink::kBold,
+                 cut(printable(title_, !terminal_.utf8), width, cut_mark(terminal_)));
+}
+
+// The title already stands above the timeline.
 std::string LiveView::header(std::size_t width) const {
-    const std::string_view mark = cut_mark(terminal_);
     const std::string job = job_.id.empty() ? "request under way" : job_line(job_);
     const std::string state = fmt::format("{} +{}  {}", spinner(), elapsed(now_us_), job);
-    return paint(terminal_, Ink::kBold, cut(printable(title_, !terminal_.utf8), width, mark)) +
-           "\n" + paint(terminal_, Ink::kBusy, cut(state, width, mark)) + "\n\n";
+    return (options_.timeline ? "" : title()) + "\n" +
+           paint(terminal_, Ink::kBusy, cut(state, width, cut_mark(terminal_))) + "\n\n";
 }
 
 // The time stands at the right edge.

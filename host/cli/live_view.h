@@ -36,6 +36,7 @@ class LiveView final : public View {
 
     void draw(const std::string &above);
     [[nodiscard]] std::string frame(std::size_t width) const;
+    [[nodiscard]] std::string title() const;
     [[nodiscard]] std::string header(std::size_t width) const;
     [[nodiscard]] std::string row_line(const Row &row, std::size_t width) const;
     [[nodiscard]] std::string spinner() const;

@@ -63,6 +63,11 @@ Ink ink_of(Outcome outcome) {
     return Ink::kWarn;
 }
 
+// To the second: runs of a scenario shall read the same.
+std::string rounded(double seconds) {
+    return seconds < 1 ? "less than a second" : fmt::format("{:.0f} s", seconds);
+}
+
 constexpr std::size_t kOutcomeWidth = 13;
 constexpr std::size_t kTimeWidth = 9;
 
@@ -102,10 +107,10 @@ void Table::add_places() {
     if (report_.job) {
         add_fact("job", job_line(*report_.job).substr(sizeof("job ") - 1));
     }
-    add_fact(
-        "time",
-        fmt::format("{} on the host's {} clock, {:.1f} s of real time", elapsed(report_.host_us),
-                    report_.request.virtual_clock ? "virtual" : "real", report_.real_seconds));
+    add_fact("time",
+             fmt::format("{} on the host's {} clock, {} of real time", elapsed(report_.host_us),
+                         report_.request.virtual_clock ? "virtual" : "real",
+                         rounded(report_.real_seconds)));
     if (report_.folder.empty()) {
         return;
     }

@@ -96,7 +96,7 @@ TEST(CliLiveView, TimelineKeepsEachChangeAbove) {
     view.begin(kRequest, {"a"});
     view.change(5'000'000, 0, {"a", 62, "busy"});
     view.end();
-    EXPECT_THAT(pipe.text(), HasSubstr("\x1b[J[+00:00:05] a  62  busy\n1 package for"));
+    EXPECT_THAT(pipe.text(), HasSubstr("\x1b[J[+00:00:05] a  62  busy\n\n"));
 }
 
 TEST(CliLiveView, WithoutRunningClockOnlyNewsIsDrawn) {
@@ -110,7 +110,7 @@ TEST(CliLiveView, WithoutRunningClockOnlyNewsIsDrawn) {
     view.end();
     const std::string text = pipe.text();
     EXPECT_LT(text.size(), 600U);
-    EXPECT_THAT(text, HasSubstr("job VELK-1: 4 Running"));
+    EXPECT_THAT(text, HasSubstr("[+00:00:00] job VELK-1: 4 Running\n"));
 }
 
 TEST(CliLiveView, MorePackagesThanTheWindowHasRowsAreNotDrawnInPlace) {
