@@ -1,0 +1,83 @@
+#include "tests/support/release_watch.h"
+
+#include <utility>
+
+namespace velktest {
+namespace {
+
+template <class Object>
+Object *noted(std::vector<Object *> &list, Object *object) {
+    if (object != nullptr) {
+        list.push_back(object);
+    }
+    return object;
+}
+
+// Whether the object still answers.
+template <class Object>
+bool is_alive(Object *object) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    Object *copy = object->ft->clone(object, &status);
+    if (copy == nullptr || status.rc != CMPI_RC_OK) {
+        return false;
+    }
+    copy->ft->release(copy);
+    return true;
+}
+
+template <class Object>
+void take_alive(std::vector<Object *> &list, const char *kind, std::vector<std::string> &alive) {
+    for (Object *object : std::exchange(list, {})) {
+        if (is_alive(object)) {
+            alive.emplace_back(kind);
+        }
+    }
+}
+
+}  // namespace
+
+const CMPIBroker *ReleaseWatch::real_ = nullptr;
+std::vector<CMPIObjectPath *> ReleaseWatch::paths_;
+std::vector<CMPIInstance *> ReleaseWatch::instances_;
+std::vector<CMPIArgs *> ReleaseWatch::args_;
+
+ReleaseWatch::ReleaseWatch(const CMPIBroker *broker)
+    : factory_(*broker->eft), up_calls_(*broker->bft), face_(*broker) {
+    real_ = broker;
+    factory_.newObjectPath = &new_path;
+    factory_.newInstance = &new_instance;
+    factory_.newArgs = &new_args;
+    up_calls_.getInstance = &get_instance;
+    face_.eft = &factory_;
+    face_.bft = &up_calls_;
+}
+
+std::vector<std::string> ReleaseWatch::unreleased() {
+    std::vector<std::string> alive;
+    take_alive(paths_, "path", alive);
+    take_alive(instances_, "instance", alive);
+    take_alive(args_, "argument list", alive);
+    return alive;
+}
+
+CMPIObjectPath *ReleaseWatch::new_path(const CMPIBroker *, const char *name_space,
+                                       const char *class_name, CMPIStatus *status) {
+    return noted(paths_, real_->eft->newObjectPath(real_, name_space, class_name, status));
+}
+
+CMPIInstance *ReleaseWatch::new_instance(const CMPIBroker *, const CMPIObjectPath *path,
+                                         CMPIStatus *status) {
+    return noted(instances_, real_->eft->newInstance(real_, path, status));
+}
+
+CMPIArgs *ReleaseWatch::new_args(const CMPIBroker *, CMPIStatus *status) {
+    return noted(args_, real_->eft->newArgs(real_, status));
+}
+
+CMPIInstance *ReleaseWatch::get_instance(const CMPIBroker *, const CMPIContext *context,
+                                         const CMPIObjectPath *path, const char **properties,
+                                         CMPIStatus *status) {
+    return noted(instances_, real_->bft->getInstance(real_, context, path, properties, status));
+}
+
+}  // namespace velktest
