@@ -37,8 +37,11 @@ class Jobs : public shim::test::ShimRoot {
             }
         }
         EXPECT_EQ(broker_.register_providers(VELK_REGISTRATION), "");
-        provider_ = dlopen(VELK_JOB_TEST_PROVIDER, RTLD_NOW);
-        script_ = symbol<Script *()>(provider_, "job_script")();
+        // Stays open, for the polls that may come to the very end.
+        void *const provider = dlopen(VELK_JOB_TEST_PROVIDER, RTLD_NOW);
+        script_ = symbol<Script *()>(provider, "job_script")();
+        tell(Answer{});
+        forget_calls();
     }
 
     ~Jobs() override {
@@ -47,7 +50,6 @@ class Jobs : public shim::test::ShimRoot {
         velkshim_set_fault_hook(nullptr, nullptr);
         velkshim_use_real_clock();
         scenario::Scenario::set_current(nullptr);
-        dlclose(provider_);
     }
 
     template <typename Function>
@@ -90,10 +92,17 @@ class Jobs : public shim::test::ShimRoot {
         return result;
     }
 
-    void tell(int state, const std::string &message) {
+    void tell(Answer answer) {
         const std::lock_guard lock(script_->mutex);
-        script_->state = state;
-        script_->message = message;
+        script_->answer = std::move(answer);
+    }
+
+    void tell(int state, const std::string &message) { tell(Answer{state, message, true, 0}); }
+
+    void forget_calls() {
+        const std::lock_guard lock(script_->mutex);
+        script_->asked_us.clear();
+        script_->cleaned_up.clear();
     }
 
     // Seconds since the beginning at which the status function was called.
@@ -139,7 +148,6 @@ class Jobs : public shim::test::ShimRoot {
     }
 
     broker::Broker broker_{{"test", {VELK_PROVIDER_DIR}}};
-    void *provider_ = nullptr;
     Script *script_ = nullptr;
 };
 

@@ -1,6 +1,7 @@
 // When a job's provider is asked, and when the job goes.
 #include <signal.h>
 
+#include <atomic>
 #include <filesystem>
 #include <thread>
 
@@ -39,7 +40,7 @@ TEST_F(JobPolling, EveryEndStopsThePolling) {
         sleep(35);
         EXPECT_EQ(asked().size(), 1U) << state;
         EXPECT_TRUE(broker_.delete_instance(path_of(id)).ok());
-        script_->asked_us.clear();
+        forget_calls();
     }
 }
 
@@ -98,8 +99,7 @@ TEST_F(JobPolling, ReadsAfterTheEndAskAgain) {
 TEST_F(JobPolling, FunctionThatKnowsNothingChangesNothing) {
     const std::string id = create();
     sleep(15);
-    script_->result = 1;
-    tell(7, "not to be seen");
+    tell(Answer{7, "not to be seen", true, 1});
     sleep(10);
     EXPECT_EQ(number(id, "JobState"), 4U);
     EXPECT_EQ(text(id, "JobStatus"), "0|a: 10: on its way|");
@@ -108,7 +108,7 @@ TEST_F(JobPolling, FunctionThatKnowsNothingChangesNothing) {
 TEST_F(JobPolling, FunctionThatLeavesStateAndTextKeepsThem) {
     const std::string id = create();
     sleep(15);
-    script_->tells = false;
+    tell(Answer{7, "not to be seen", false, 0});
     sleep(10);
     EXPECT_EQ(number(id, "JobState"), 4U);
     EXPECT_EQ(text(id, "JobStatus"), "0|a: 10: on its way|");
@@ -162,9 +162,10 @@ TEST_F(JobPolling, NothingTurnsWhileNothingHappens) {
     tell(7, "1|a: 50: done|");
     create();
     sleep(15);
-    int pauses = 0;
+    std::atomic<int> pauses = 0;
     velkshim_observe_pauses(
-        [](void *count, std::int64_t, std::int64_t) { ++*static_cast<int *>(count); }, &pauses);
+        [](void *count, std::int64_t, std::int64_t) { ++*static_cast<std::atomic<int> *>(count); },
+        &pauses);
     sleep(100'000);
     velkshim_observe_pauses(nullptr, nullptr);
     EXPECT_EQ(pauses, 1);  // this test's own; the job's thread was in its last one before

@@ -8,13 +8,16 @@
 
 namespace velkhost::jobs::test {
 
-struct Script {
-    std::mutex mutex;
-    int result = 0;  // of the status function
+struct Answer {
     int state = 4;
     std::string message = "0|a: 10: on its way|";
-    bool tells = true;  // false: leaves state and message as they are
+    bool is_told = true;  // false: state and message stay as they are
+    int result = 0;       // of the status function
+};
 
+struct Script {
+    std::mutex mutex;  // guards all; the clock orders threads but hands nothing over
+    Answer answer;
     std::vector<std::int64_t> asked_us;   // when the status function was called
     std::vector<std::string> cleaned_up;  // for which jobs
 };
