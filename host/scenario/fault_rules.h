@@ -13,8 +13,9 @@ namespace velkhost::scenario {
 
 // How a step that a fault has struck fails.
 struct Fault {
-    int code = 0;  // errno for a libc step, CIM status for any other
+    int code = 0;  // as in the rule
     std::string message;
+    ControllerFault controller = ControllerFault::kNone;
 };
 
 // Safe to use from any thread.

@@ -27,6 +27,7 @@ constexpr std::array kFamilies{
     Family{"job.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"zeb.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"filetransfer.", Rest::kName,    CodeKind::kCimStatus},
+    Family{"bmc.",          Rest::kName,    CodeKind::kController},
 };
 // clang-format on
 

@@ -10,11 +10,11 @@
 namespace velkhost::scenario {
 
 // What a fault's code means to whoever serves the step.
-enum class CodeKind { kErrno, kCimStatus };
+enum class CodeKind { kErrno, kCimStatus, kController };
 
 // The kind of a step's code; no value for a step that nobody serves. Known are the shim's libc
 // calls ("open:/tmp/...", "thread.create"), and the steps of the broker ("broker.newObjectPath"),
-// the job library and the providers.
+// the job library, the providers and the management controller ("bmc.create").
 VELKSCENARIO_API std::optional<CodeKind> step_code_kind(std::string_view step);
 
 // The begin of every known step, for messages: "open:, unlink:, ...".

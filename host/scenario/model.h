@@ -64,6 +64,26 @@ struct ServiceAnswer {
     std::optional<std::vector<JobLook>> job;
 };
 
+// [controller]: the management controller behind the host's IPMI device.
+struct ControllerSettings {
+    bool present = true;             // false: the host has no such device
+    std::uint32_t type = 2;          // 0: knows no sessions, 1: first generation, 2: second
+    std::string secure_mode = "no";  // text of its variable, up to 127 bytes; "yes" in it: secure
+};
+
+// What a fault at a step "bmc.NAME" does.
+enum class ControllerFault {
+    kNone,            // the fault is none of the controller's
+    kNoAnswer,        // silence; the request is not served
+    kCompletionCode,  // nothing but a completion code; the request is not served
+    kRefuse,          // an answer with the result flag clear; the request is not served
+    kVanish,          // the device goes, for good
+    kLate,            // the answer comes late
+    kWrongFunction,   // the answer bears another network function
+    kWrongCommand,    // the answer bears another command
+    kLonger,          // the answer is filled up with zeros
+};
+
 // A fault strikes at a named step: it lets `after` passes of the step go by, then strikes `count`
 // times. A step that ends in '*' stands for all that begin so. `match` narrows it to passes whose
 // subject (a URI, a class name, a job id) contains it; empty matches all.
@@ -74,8 +94,10 @@ struct FaultRule {
     std::string match;
     std::uint32_t after = 0;
     std::uint32_t count = 1;
-    int code = 0;         // errno for a libc step, CIM status for any other
+    int code = 0;         // errno for a libc step, CIM status for others; see `controller`
     std::string message;  // status message, for steps that carry one
+    // With kCompletionCode `code` is that code, with kLate the seconds, with kLonger the bytes.
+    ControllerFault controller = ControllerFault::kNone;
     int line = 0;         // where the rule stands in its file; 0 when it comes from elsewhere
 };
 
@@ -83,6 +105,7 @@ struct Description {
     std::string source = "built-in default";  // the file's name as it was given
     HostSettings host;
     JobSettings jobs;
+    ControllerSettings controller;
     std::vector<ServiceAnswer> management_controller;
     FileTransferSettings file_transfer;
     std::vector<FaultRule> faults;

@@ -1,5 +1,6 @@
 #include "host/scenario/reader.h"
 
+#include "host/scenario/controller_reader.h"
 #include "host/scenario/fault_steps.h"
 #include "host/scenario/read_file.h"
 #include "host/scenario/table_reader.h"
@@ -165,6 +166,11 @@ FaultRule read_fault(TableReader in) {
     assign(rule.match, in.text("match"));
     assign(rule.after, in.number("after", 0, kMostTurns));
     rule.count = read_count(in);
+    if (*kind == CodeKind::kController) {
+        read_controller_fault(in, rule);
+        in.finish();
+        return rule;
+    }
     rule.code = read_code(in, *kind);
     assign(rule.message, in.text("message"));
     if (*kind == CodeKind::kErrno && !(rule.message.empty() && rule.match.empty())) {
@@ -192,6 +198,9 @@ Description parse_description(std::string_view text, const std::string &source) 
     }
     if (auto table = in.table("jobs")) {
         out.jobs = read_jobs(*std::move(table));
+    }
+    if (auto table = in.table("controller")) {
+        out.controller = read_controller(*std::move(table));
     }
     if (auto table = in.table("management_controller")) {
         out.management_controller = read_service(*std::move(table));

@@ -17,6 +17,7 @@ Scenario::Scenario(Description description)
     : source(std::move(description.source)),
       host(std::move(description.host)),
       jobs(description.jobs),
+      controller(std::move(description.controller)),
       file_transfer(std::move(description.file_transfer)),
       management_controller(std::move(description.management_controller)),
       faults(std::move(description.faults)) {}

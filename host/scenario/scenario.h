@@ -32,6 +32,7 @@ class VELKSCENARIO_API Scenario {
     const std::string source;
     const HostSettings host;
     const JobSettings jobs;
+    const ControllerSettings controller;
     const FileTransferSettings file_transfer;
     AnswerBook management_controller;
     FaultRules faults;

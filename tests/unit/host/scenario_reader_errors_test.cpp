@@ -36,7 +36,7 @@ TEST_P(ScenarioReaderErrors, NameFileLineAndReason) {
 
 constexpr const char *kSteps =
     "open:/path, unlink:/path, rmdir:/path, opendir:/path, dlopen:/path, thread.create, "
-    "broker.name, job.name, zeb.name, filetransfer.name";
+    "broker.name, job.name, zeb.name, filetransfer.name, bmc.name";
 
 const std::string kNoStep =
     std::string("2: [fault] \"step\" is none that is served; served are ") + kSteps;
@@ -46,7 +46,7 @@ const std::string kMissingStep =
 // clang-format off
 INSTANTIATE_TEST_SUITE_P(Root, ScenarioReaderErrors, ::testing::Values(
     Mistake{"UnknownTable", "[hosts]",
-            "1: unknown key \"hosts\"; known are host, jobs, management_controller, file_transfer, fault"},
+            "1: unknown key \"hosts\"; known are host, jobs, controller, management_controller, file_transfer, fault"},
     Mistake{"NoTable", "host = 1", "1: [host] must be a table, not a whole number"},
     Mistake{"NoArrayOfTables", "fault = 1", "1: \"fault\" must be an array of tables, not a whole number"},
     Mistake{"TableForArray", "\n[fault]", "2: \"fault\" must be an array of tables, not a table"},
