@@ -1,6 +1,7 @@
 // The calls that open and close descriptors: open, creat, close, opendir and their relatives.
 #include <cstdarg>
 
+#include "host/shim/device_opens.h"
 #include "host/shim/libc_calls.h"
 #include "host/shim/on_path.h"
 #include "host/shim/open_files.h"
@@ -18,6 +19,9 @@ int open_descriptor(const char *path, int flags, OpenCall open_call) {
     const Rerooted target(path);
     if (const int error = target.refusal("open"); error != 0) {
         return fail_with<int>(error);
+    }
+    if (const auto device = open_device(target, flags)) {
+        return *device;
     }
     const int descriptor = open_call(target.path());
     remember_open(descriptor, target, purpose_of(flags));
@@ -118,6 +122,7 @@ VELKSHIM_API int creat64(const char *path, mode_t mode) {
 
 VELKSHIM_API int close(int descriptor) {
     const shim::Closing closing(descriptor);
+    shim::forget_device(descriptor);
     return shim::closed(closing, "close", shim::libc().close(descriptor));
 }
 

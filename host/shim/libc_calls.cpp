@@ -69,6 +69,17 @@ void find_inspections() {
     find(table.statx, "statx");
 }
 
+void find_devices() {
+    find(table.ioctl, "ioctl");
+    find(table.poll, "poll");
+    find(table.poll_chk, "__poll_chk");
+    find(table.dup, "dup");
+    find(table.dup2, "dup2");
+    find(table.dup3, "dup3");
+    find(table.fcntl, "fcntl");
+    find(table.fcntl64, "fcntl64");
+}
+
 void find_clock_and_threads() {
     find(table.sleep, "sleep");
     find(table.usleep, "usleep");
@@ -89,6 +100,7 @@ void fill() {
     find_files();
     find_names();
     find_inspections();
+    find_devices();
     find_clock_and_threads();
     find(table.dlopen, "dlopen");
     find(table.uname, "uname");

@@ -4,7 +4,9 @@
 #include <dirent.h>
 #include <dlfcn.h>
 #include <fcntl.h>
+#include <poll.h>
 #include <pthread.h>
+#include <sys/ioctl.h>
 #include <sys/stat.h>
 #include <sys/time.h>
 #include <sys/utsname.h>
@@ -53,6 +55,15 @@ struct LibcCalls {
     decltype(&::fstatat) fstatat;
     decltype(&::fstatat64) fstatat64;
     decltype(&::statx) statx;
+
+    decltype(&::ioctl) ioctl;
+    decltype(&::poll) poll;
+    int (*poll_chk)(pollfd *, nfds_t, int, size_t);
+    decltype(&::dup) dup;
+    decltype(&::dup2) dup2;
+    decltype(&::dup3) dup3;
+    decltype(&::fcntl) fcntl;
+    decltype(&::fcntl64) fcntl64;
 
     decltype(&::dlopen) dlopen;
 

@@ -78,6 +78,44 @@ VELKSHIM_API void velkshim_observe_pauses(velkshim_pause_observer observer, void
 // The node name that uname reports (copied, cut to its field); NULL for the machine's own.
 VELKSHIM_API void velkshim_set_node_name(const char *name);
 
+// ---- Management controller ----
+
+// A request that the IPMI driver gives to the controller. Valid during the call alone.
+typedef struct velkshim_ipmi_request {
+    uint8_t netfn;
+    uint8_t cmd;
+    const uint8_t *data;
+    size_t length;
+} velkshim_ipmi_request;
+
+// The controller's answer. `data` begins with the completion code; `length` is that of the whole
+// answer also where the data was cut to fit.
+typedef struct velkshim_ipmi_answer {
+    int64_t delay_us;  // from the request to the answer, 0 or more
+    uint8_t netfn;
+    uint8_t cmd;
+    size_t length;
+    uint8_t data[272];
+} velkshim_ipmi_answer;
+
+typedef enum velkshim_ipmi_outcome {
+    VELKSHIM_IPMI_SILENT,    // no answer, ever
+    VELKSHIM_IPMI_ANSWERED,  // `answer` is filled
+    VELKSHIM_IPMI_GONE       // the controller has gone, and the device with it
+} velkshim_ipmi_outcome;
+
+// What answers behind /dev/ipmi0 under the root. NULL: nothing, and opening the device fails with
+// ENOENT as long as there is no such file. `now_us` is when the request reaches the controller; a
+// call may come later than that, but calls come in that order, one at a time.
+//
+// Descriptors of the device behave as the kernel's driver has them, in the shim's time: open,
+// close, ioctl, poll and the dup family know them; select and the others do not. Setting another
+// controller drops all that is under way.
+typedef velkshim_ipmi_outcome (*velkshim_controller)(void *context,
+                                                     const velkshim_ipmi_request *request,
+                                                     int64_t now_us, velkshim_ipmi_answer *answer);
+VELKSHIM_API void velkshim_set_device(velkshim_controller controller, void *context);
+
 // ---- Faults ----
 
 // Asked before each call that the shim serves on a re-rooted path, with the name of the step, such
