@@ -76,6 +76,8 @@ TEST(ScenarioFile, RuleWithoutAStrikeIsReported) {
     Scenario host(read_description(path_of("thread-failure")));
     EXPECT_EQ(host.faults.unfired().size(), 1U);
     host.faults.take("thread.create");
+    EXPECT_EQ(host.faults.unfired().size(), 1U);
+    host.faults.take("thread.create");
     EXPECT_TRUE(host.faults.unfired().empty());
 }
 

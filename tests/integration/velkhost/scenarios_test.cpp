@@ -1,0 +1,103 @@
+// Every shipped scenario with the example request: how each package ends, how long it takes on the
+// host's clock, what the job says and what the exit code is.
+#include "tests/integration/velkhost/fixture.h"
+
+#include <algorithm>
+#include <array>
+#include <ostream>
+#include <set>
+
+namespace velkhost::testing {
+namespace {
+
+constexpr int kNone = -1;
+constexpr std::size_t kPackages = 7;
+
+struct Row {
+    const char *scenario;
+    int exit_code;
+    int job_state;  // CIM_ConcreteJob.JobState, kNone without a job
+    double host_seconds;
+    // In the order of the request: fpga, rxc2, uefi 1.50, uefi 1.60, rxc of node 2, diag, rxc.
+    std::array<int, kPackages> codes;
+};
+
+// clang-format off
+const std::vector<Row> kRows = {
+    {"broker-null-path",       1,  7, 420, {50, 50, 50, 50, 50,  0, 50}},
+    {"controller-ffdc",        1,  7,  70, {50, 50, 53, 53, 50, 53, 50}},
+    {"controller-lock-failed", 1, 10, 210, {53, 53, 53, 53, 53, 53, 53}},
+    {"controller-no-ipmi",     1, 10, 210, {53, 53, 53, 53, 53, 53, 53}},
+    {"controller-no-ping",     1, 10, 210, {53, 53, 53, 53, 53, 53, 53}},
+    {"controller-unknown-text", 1, 10, 140, {57, 57, 57, 57, 57, 57, 57}},
+    {"default",                1,  7, 550, {50, 50, 50, 50, 53, 50, 50}},
+    {"job-library-lost",       3, kNone, 60, {}},
+    {"job-library-recovers",   0,  7, 514, {50, 50, 50, 50, 50, 50, 50}},
+    {"no-job-reference",       1, 10, 210, {57, 57, 57, 57, 57, 57, 57}},
+    {"start-refused",          1,  7, 430, {50, 50, 50, 50, 50, 56, 50}},
+    {"status-file-unwritable", 0,  2, 490, {50, 50, 50, 50, 50, 50, 50}},
+    {"status-lost",            1, 10, 280, {57, 57, 57, 57, 57, 57, 57}},
+    {"status-recovers",        0,  7, 420, {50, 50, 50, 50, 50, 50, 50}},
+    {"thread-failure",         3, kNone, 1, {}},
+    {"uri-not-accessible",     1, 10,  70, {56, 56, 56, 56, 56, 56, 56}},
+};
+// clang-format on
+
+class VelkhostScenario : public VelkhostTest, public ::testing::WithParamInterface<Row> {};
+
+TEST_P(VelkhostScenario, EndsAsItSays) {
+    const Row &row = GetParam();
+    std::vector<std::string> arguments = {"--scenario",
+                                          std::string(kScenarios) + row.scenario + ".toml"};
+    const auto uris = example_request();
+    ASSERT_EQ(uris.size(), kPackages);
+    arguments.insert(arguments.end(), uris.begin(), uris.end());
+    const auto document = velkhost_json(arguments);
+
+    EXPECT_EQ(document["exit_code"], row.exit_code);
+    EXPECT_EQ(document["host_seconds"], row.host_seconds);
+    EXPECT_EQ(document["findings"], nlohmann::json::array());
+    EXPECT_EQ(document["unfired_faults"], nlohmann::json::array());
+    if (row.job_state == kNone) {
+        EXPECT_TRUE(document["job"].is_null());
+        EXPECT_TRUE(document["packages"].empty());
+        return;
+    }
+    EXPECT_EQ(document["job"]["id"], "VELK-1");
+    EXPECT_EQ(document["job"]["state"], row.job_state);
+    ASSERT_EQ(document["packages"].size(), kPackages);
+    for (std::size_t i = 0; i < kPackages; ++i) {
+        EXPECT_EQ(document["packages"][i]["code"], row.codes[i]) << document["packages"][i];
+    }
+}
+
+// How messages show a row; a name that the test framework looks for.
+// NOLINTNEXTLINE(readability-identifier-naming)
+void PrintTo(const Row &row, std::ostream *out) {
+    *out << row.scenario;
+}
+
+std::string test_name(const ::testing::TestParamInfo<Row> &row) {
+    std::string name = row.param.scenario;
+    std::replace(name.begin(), name.end(), '-', '_');
+    return name;
+}
+
+INSTANTIATE_TEST_SUITE_P(All, VelkhostScenario, ::testing::ValuesIn(kRows), test_name);
+
+TEST(VelkhostScenarios, EveryShippedFileHasItsRow) {
+    std::set<std::string> files;
+    for (const auto &entry : std::filesystem::directory_iterator(VELK_SCENARIO_DIR)) {
+        if (entry.path().extension() == ".toml") {
+            files.insert(entry.path().stem());
+        }
+    }
+    std::set<std::string> rows;
+    for (const Row &row : kRows) {
+        rows.insert(row.scenario);
+    }
+    EXPECT_EQ(files, rows);
+}
+
+}  // namespace
+}  // namespace velkhost::testing
