@@ -100,6 +100,7 @@ void InstallRun::follow() {
     report_.limit_reached = !rig_->wait_until_idle(options_.limit, [this] { tick(); });
     report_.host_us = since_start();
     if (!report_.limit_reached) {
+        report_.host_us = rig_->last_activity_us() - report_.request.started_us;
         settle_job();
     }
 }

@@ -172,7 +172,7 @@ bool Rig::busy() const {
 }
 
 bool Rig::wait_until_idle(std::chrono::microseconds limit, const std::function<void()> &on_tick) {
-    constexpr std::int64_t kVirtualStep = 1'000'000;
+    constexpr std::int64_t kVirtualStep = 10'000'000;
     constexpr std::int64_t kRealStep = 100'000;
     const std::int64_t step = state_->virtual_clock ? kVirtualStep : kRealStep;
     const std::int64_t deadline = state_->request_start_us + limit.count();
@@ -195,6 +195,12 @@ std::vector<PackageStatus> Rig::results() const {
     const auto library = state_->library();
     if (library && library->running_installs() == 0) {
         return library->results();
+std::int64_t Rig::last_activity_us() const {
+    // A log that cannot be written tells nothing.
+    const std::int64_t last = state_->session ? state_->session->last_log_us() : 0;
+    return last == 0 ? host_now_us() : last;
+}
+
     }
     const auto entries = state_->history.entries();
     return entries.empty() ? std::vector<PackageStatus>{} : entries.back().line.packages;

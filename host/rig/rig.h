@@ -82,11 +82,16 @@ class Rig {
     [[nodiscard]] bool busy() const;
 
     // Waits for the end of all install threads, at most for `limit` of the host's time; whether
-    // they ended. `on_tick` is called every second of the virtual clock, every tenth of the real.
+    // they ended. `on_tick` is called every ten seconds of the virtual clock, every tenth of one of
+    // the real.
     bool wait_until_idle(std::chrono::microseconds limit,
                          const std::function<void()> &on_tick = {});
 
     // The packages of the latest request as the library left them, in its order; while an install
+    // When the library last did anything, by its debug log: the exact end of a request that is
+    // over, whenever that was noticed. Microseconds since 1970-01-01 UTC.
+    [[nodiscard]] std::int64_t last_activity_us() const;
+
     // thread is at work, as its last status line has them.
     [[nodiscard]] std::vector<PackageStatus> results() const;
 

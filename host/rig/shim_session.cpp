@@ -43,8 +43,12 @@ int ShimSession::strike(void *session, const char *step) {
 }
 
 void ShimSession::note_file(void *session, const char *path, std::int64_t now_us) {
+    constexpr std::string_view kLog = "/tmp/velkdebug.txt";
     constexpr std::string_view kStatusFile = "/tmp/sfcb/velkstat";
     auto &self = *static_cast<ShimSession *>(session);
+    if (path == kLog) {
+        self.last_log_us_.store(now_us);
+    }
     if (!std::string_view(path).starts_with(kStatusFile)) {
         return;
     }

@@ -4,6 +4,8 @@
 #include "host/rig/status_history.h"
 #include "host/scenario/scenario.h"
 
+#include <atomic>
+#include <cstdint>
 #include <filesystem>
 #include <string>
 
@@ -20,6 +22,9 @@ class ShimSession {
     ShimSession(const ShimSession &) = delete;
     ShimSession &operator=(const ShimSession &) = delete;
 
+    // When the library last wrote to its debug log; 0 before the first time.
+    [[nodiscard]] std::int64_t last_log_us() const { return last_log_us_.load(); }
+
   private:
     static int strike(void *session, const char *step);
     static void note_file(void *session, const char *path, std::int64_t now_us);
@@ -27,6 +32,7 @@ class ShimSession {
     const std::filesystem::path root_;
     scenario::Scenario &scenario_;
     StatusHistory &history_;
+    std::atomic<std::int64_t> last_log_us_{0};
 };
 
 // Time of the host's clock, microseconds since 1970-01-01 UTC.
