@@ -89,11 +89,12 @@ configure() {
 }
 
 # build_and_test PRESET [PREFIX...]: programs run during the build as well, to list their tests.
+# The build goes on past errors, so that one run shows them all.
 build_and_test() {
   local preset=$1
   shift
   configure "$preset"
-  "$@" cmake --build --preset "$preset"
+  "$@" cmake --build --preset "$preset" -- -k 0
   "$@" ctest --preset "$preset"
 }
 

@@ -42,6 +42,7 @@ constexpr const char *kSecureModeVariable = "secure_mode";
 Bytes frame(std::uint8_t code, bool result, const Bytes &elements) {
     Bytes out{kCompleted, code, static_cast<std::uint8_t>(result ? 1 : 0), 0,
               static_cast<std::uint8_t>(elements.size())};
+    out.reserve(out.size() + elements.size());
     out.insert(out.end(), elements.begin(), elements.end());
     return out;
 }
