@@ -64,7 +64,7 @@ void Trace::finish(std::uint64_t number, const Status &status, std::string resul
         if (entries_.empty() || number < entries_.front().number) {
             return;
         }
-        TraceEntry &entry = entries_[number - entries_.front().number];
+        TraceEntry &entry = entries_[static_cast<std::size_t>(number - entries_.front().number)];
         entry.finished = true;
         entry.status = status;
         entry.result = std::move(result);
