@@ -49,7 +49,7 @@ class TableReader {
     template <typename T>
     const T *typed(std::string_view key, const char *wanted);
     [[noreturn]] void fail_at(int line, const std::string &message) const;
-    std::string checked_text(std::string_view key, const std::string &text) const;
+    [[nodiscard]] std::string checked_text(std::string_view key, const std::string &text) const;
 
     const Node &node_;
     const Table &table_;
