@@ -35,7 +35,8 @@ std::string quoted(const std::string &text) {
 int make_packages(const std::string &arguments) {
     const std::string command =
         quoted(std::string(VELK_EXAMPLES_DIR) + "/make_packages.sh") + ' ' + arguments + " 2>&1";
-    FILE *output = ::popen(command.c_str(), "r");
+    // The command is made of this test's own paths.
+    FILE *output = ::popen(command.c_str(), "r");  // NOLINT(cert-env33-c)
     std::array<char, 256> line{};
     while (::fgets(line.data(), static_cast<int>(line.size()), output) != nullptr) {
     }
@@ -51,13 +52,14 @@ std::map<std::string, std::string> contents(const fs::path &folder) {
 }
 
 class ExamplePackages : public ::testing::Test {
+  public:
+    ~ExamplePackages() override { fs::remove_all(folder_); }
+
   protected:
     ExamplePackages() {
         std::string name = (fs::temp_directory_path() / "velk-packages-XXXXXX").string();
         folder_ = ::mkdtemp(name.data());
     }
-    ~ExamplePackages() override { fs::remove_all(folder_); }
-
     [[nodiscard]] std::string argument() const { return quoted(folder_.string()); }
 
     fs::path folder_;
@@ -164,7 +166,8 @@ TEST_P(ExampleDescriptors, HaveTensOfProperties) {
 TEST_P(ExampleDescriptors, SayTheSameToALineReaderAndToAnXmlParser) {
     const std::string text = read(GetParam());
     for (const char *name : {"Name", "category", "payload", "identificationCode"}) {
-        const std::string header = std::string("<PROPERTY NAME=\"") + name + "\" TYPE=\"string\">";
+        const std::string header =
+            std::string(R"(<PROPERTY NAME=")") + name + R"(" TYPE="string">)";
         EXPECT_EQ(line_value(text, header), descriptor_.value(name)) << name;
         EXPECT_FALSE(descriptor_.value(name).empty()) << name;
     }

@@ -115,8 +115,10 @@ TEST_F(ControllerProvider, LatestJobsAreRemembered) {
 TEST_F(ControllerProvider, JobsOfManyThreadsDoNotMix) {
     play("[[management_controller.answer]]\njob = [{ status = '0x00|a' }, { status = '0x00|b' }]");
     const std::string uri = make_file("a.upd");
+    constexpr int kWorkers = 4;
     std::vector<std::thread> threads;
-    for (int worker = 0; worker < 4; ++worker) {
+    threads.reserve(kWorkers);
+    for (int worker = 0; worker < kWorkers; ++worker) {
         threads.emplace_back([&] {
             for (int round = 0; round < 20; ++round) {
                 EXPECT_THAT(reads(start(uri), 3), ElementsAre("0x00|a", "0x00|b", "0x00|b"));

@@ -20,7 +20,7 @@ class FileTransferProvider : public ProviderTest {
     }
     // Makes the file count as transferred.
     std::string transferred(const std::string &name) {
-        const std::string uri = make_file(name);
+        std::string uri = make_file(name);
         play("[file_transfer]\ntransferred = ['" + (folder_ / name).string() + "']");
         return uri;
     }

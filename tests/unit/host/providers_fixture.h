@@ -19,6 +19,14 @@
 namespace velkhost::providers::testing {
 
 class ProviderTest : public ::testing::Test {
+  public:
+    ~ProviderTest() override {
+        broker_.shutdown();
+        EXPECT_EQ(broker_.ledger().report(), "");
+        scenario::Scenario::set_current(nullptr);
+        std::filesystem::remove_all(folder_);
+    }
+
   protected:
     ProviderTest() {
         std::string name = (std::filesystem::temp_directory_path() / "velk-XXXXXX").string();
@@ -31,13 +39,6 @@ class ProviderTest : public ::testing::Test {
             }
         }
         EXPECT_EQ(broker_.register_providers(VELK_REGISTRATION), "");
-    }
-
-    ~ProviderTest() override {
-        broker_.shutdown();
-        EXPECT_EQ(broker_.ledger().report(), "");
-        scenario::Scenario::set_current(nullptr);
-        std::filesystem::remove_all(folder_);
     }
 
     // The scenario of the test, as the text of its file.

@@ -18,6 +18,14 @@ namespace fs = std::filesystem;
 using scenario::Scenario;
 
 class ScenarioAtItsPath : public ::testing::Test {
+  public:
+    ~ScenarioAtItsPath() override {
+        broker_.shutdown();
+        Scenario::set_current(nullptr);
+        velkshim_set_root(nullptr);
+        fs::remove_all(root_);
+    }
+
   protected:
     ScenarioAtItsPath() {
         std::string name = (fs::temp_directory_path() / "velk-root-XXXXXX").string();
@@ -26,13 +34,6 @@ class ScenarioAtItsPath : public ::testing::Test {
         EXPECT_EQ(velkshim_set_root(root_.c_str()), 0);
         EXPECT_EQ(broker_.register_providers(VELK_REGISTRATION), "");
     }
-    ~ScenarioAtItsPath() override {
-        broker_.shutdown();
-        Scenario::set_current(nullptr);
-        velkshim_set_root(nullptr);
-        fs::remove_all(root_);
-    }
-
     void write(const std::string &text) {
         std::ofstream(root_ / "etc/velkhost/scenario.toml") << text;
     }

@@ -115,8 +115,10 @@ TEST(FaultRules, ManyThreadsShareOneCount) {
     some.count = 500;
     FaultRules rules({some});
     std::atomic<int> struck = 0;
+    constexpr int kWorkers = 4;
     std::vector<std::thread> threads;
-    for (int worker = 0; worker < 4; ++worker) {
+    threads.reserve(kWorkers);
+    for (int worker = 0; worker < kWorkers; ++worker) {
         threads.emplace_back([&] {
             for (int pass = 0; pass < 250; ++pass) {
                 struck += rules.take("thread.create") ? 1 : 0;
