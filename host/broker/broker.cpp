@@ -51,7 +51,7 @@ void Broker::register_provider(const std::string &name_space, const std::string 
 
 Status Broker::load_providers() {
     for (const ProviderPointer &provider : core_->providers.all()) {
-        if (const Status status = provider->load(*core_).status; !status.ok()) {
+        if (Status status = provider->load(*core_).status; !status.ok()) {
             return status;
         }
     }

@@ -65,7 +65,7 @@ std::string from_microseconds(std::uint64_t microseconds, bool interval) {
         // 2^64 microseconds end in the year 586524; the text has four digits.
         const year_month_day day{sys_days(std::chrono::days(static_cast<int>(days)))};
         const auto year = static_cast<std::uint64_t>(static_cast<int>(day.year())) % 10'000;
-        date = year * 10'000 + static_cast<unsigned>(day.month()) * 100U +
+        date = year * 10'000 + std::uint64_t{static_cast<unsigned>(day.month())} * 100 +
                static_cast<unsigned>(day.day());
     }
     std::array<char, kLength + 40> text{};

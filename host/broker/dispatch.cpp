@@ -8,9 +8,15 @@
 namespace velkhost::broker {
 namespace {
 
-const Status kNoProvider{CMPI_RC_ERR_FAILED, "Provider not found or not loadable"};
-const Status kNotFound{CMPI_RC_ERR_NOT_FOUND, "The requested object could not be found"};
-const Status kNotSupported{CMPI_RC_ERR_NOT_SUPPORTED, "The requested operation is not supported"};
+Status no_provider() {
+    return {CMPI_RC_ERR_FAILED, "Provider not found or not loadable"};
+}
+Status not_found_here() {
+    return {CMPI_RC_ERR_NOT_FOUND, "The requested object could not be found"};
+}
+Status not_supported() {
+    return {CMPI_RC_ERR_NOT_SUPPORTED, "The requested operation is not supported"};
+}
 
 // Association requests give "any" as a null pointer.
 const char *or_any(const std::string &text) {
@@ -19,7 +25,7 @@ const char *or_any(const std::string &text) {
 
 ObjectsReply at_most_one(ObjectsReply reply) {
     if (reply.status.ok() && reply.objects.empty()) {
-        reply.status = kNotFound;
+        reply.status = not_found_here();
     }
     return reply;
 }
@@ -157,16 +163,17 @@ ObjectsReply Dispatcher::enumerate(Form form, const cim::ObjectPath &path,
 }
 
 ObjectsReply Dispatcher::get_instance(const cim::ObjectPath &path, const NameList &properties) {
-    return at_most_one(ask_owner(path, kNotFound, [&](ProviderCall &call, const auto &interfaces) {
-        CMPIInstanceMI *mi = interfaces.instance;
-        return mi->ft->getInstance(mi, call.context(), call.result(), call.path(path),
-                                   call.names(properties));
-    }));
+    return at_most_one(
+        ask_owner(path, not_found_here(), [&](ProviderCall &call, const auto &interfaces) {
+            CMPIInstanceMI *mi = interfaces.instance;
+            return mi->ft->getInstance(mi, call.context(), call.result(), call.path(path),
+                                       call.names(properties));
+        }));
 }
 
 ObjectsReply Dispatcher::create_instance(const cim::ObjectPath &path,
                                          const cim::Instance &instance) {
-    return ask_owner(path, kNotSupported, [&](ProviderCall &call, const auto &interfaces) {
+    return ask_owner(path, not_supported(), [&](ProviderCall &call, const auto &interfaces) {
         CMPIInstanceMI *mi = interfaces.instance;
         return mi->ft->createInstance(mi, call.context(), call.result(), call.path(path),
                                       call.instance(instance));
@@ -175,7 +182,7 @@ ObjectsReply Dispatcher::create_instance(const cim::ObjectPath &path,
 
 ObjectsReply Dispatcher::modify_instance(const cim::ObjectPath &path, const cim::Instance &instance,
                                          const NameList &properties) {
-    return ask_owner(path, kNotSupported, [&](ProviderCall &call, const auto &interfaces) {
+    return ask_owner(path, not_supported(), [&](ProviderCall &call, const auto &interfaces) {
         CMPIInstanceMI *mi = interfaces.instance;
         return mi->ft->modifyInstance(mi, call.context(), call.result(), call.path(path),
                                       call.instance(instance), call.names(properties));
@@ -183,7 +190,7 @@ ObjectsReply Dispatcher::modify_instance(const cim::ObjectPath &path, const cim:
 }
 
 ObjectsReply Dispatcher::delete_instance(const cim::ObjectPath &path) {
-    return ask_owner(path, kNotSupported, [&](ProviderCall &call, const auto &interfaces) {
+    return ask_owner(path, not_supported(), [&](ProviderCall &call, const auto &interfaces) {
         CMPIInstanceMI *mi = interfaces.instance;
         return mi->ft->deleteInstance(mi, call.context(), call.result(), call.path(path));
     });
@@ -191,7 +198,7 @@ ObjectsReply Dispatcher::delete_instance(const cim::ObjectPath &path) {
 
 ObjectsReply Dispatcher::exec_query(const cim::ObjectPath &path, const std::string &query,
                                     const std::string &language) {
-    return ask_owner(path, kNotSupported, [&](ProviderCall &call, const auto &interfaces) {
+    return ask_owner(path, not_supported(), [&](ProviderCall &call, const auto &interfaces) {
         CMPIInstanceMI *mi = interfaces.instance;
         return mi->ft->execQuery(mi, call.context(), call.result(), call.path(path), query.c_str(),
                                  language.c_str());
@@ -205,7 +212,7 @@ ObjectsReply Dispatcher::associators(Form form, const cim::ObjectPath &path,
     }
     const auto targets = association_targets(path, query.association_class);
     if (targets.empty()) {
-        return {{CMPI_RC_ERR_NOT_FOUND, kNoProvider.message}, {}};
+        return {{CMPI_RC_ERR_NOT_FOUND, no_provider().message}, {}};
     }
     return ask_all(targets, [&](ProviderCall &call, const auto &interfaces, const auto &target) {
         CMPIAssociationMI *mi = interfaces.association;
@@ -229,7 +236,7 @@ ObjectsReply Dispatcher::references(Form form, const cim::ObjectPath &path,
     }
     const auto targets = association_targets(path, query.result_class);
     if (targets.empty()) {
-        return {{CMPI_RC_ERR_NOT_FOUND, kNoProvider.message}, {}};
+        return {{CMPI_RC_ERR_NOT_FOUND, no_provider().message}, {}};
     }
     return ask_all(targets, [&](ProviderCall &call, const auto &interfaces, const auto &target) {
         CMPIAssociationMI *mi = interfaces.association;
@@ -249,7 +256,7 @@ MethodReply Dispatcher::invoke(const cim::ObjectPath &path, const std::string &m
     const ProviderPointer provider = method_provider(path);
     if (provider == nullptr || !caller_.is_client) {
         const bool known = core_.repository.find_class(path) != nullptr;
-        reply.status = known ? kNoProvider : Status{CMPI_RC_ERR_INVALID_CLASS, "Class not found"};
+        reply.status = known ? no_provider() : Status{CMPI_RC_ERR_INVALID_CLASS, "Class not found"};
         if (provider == nullptr || !known) {
             return reply;
         }

@@ -86,7 +86,7 @@ CMPIArray *new_array(const CMPIBroker *broker, CMPICount count, CMPIType type, C
                            {element, count == 0, std::vector<CMPIData>(count, null), {}});
 }
 
-CMPIDateTime *make_time(Core &core, const char *maker, std::string text) {
+CMPIDateTime *make_time(Core &core, const char *maker, const std::string &text) {
     return make<CMPIDateTime>(core, kTracked, {maker, text}, text);
 }
 

@@ -159,7 +159,7 @@ void Ledger::leave_frame() {
     ThreadBook::of(*this).leave();
 }
 
-void Ledger::drop_this_thread() {
+void Ledger::drop_this_thread() const {
     ThreadBook::drop(*this);
 }
 

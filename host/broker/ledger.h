@@ -67,7 +67,7 @@ class VELKBROKER_API Ledger : public std::enable_shared_from_this<Ledger> {
     void leave_frame();
 
     // Frees what the calling thread still tracks. Called when its broker goes.
-    void drop_this_thread();
+    void drop_this_thread() const;
 
   private:
     void remove_clone(Tag &tag);

@@ -6,25 +6,30 @@
 namespace velkhost::broker {
 namespace {
 
+template <class... Slots>
+bool all_filled(Slots... slots) {
+    return ((slots != nullptr) && ...);
+}
+
 // Whether every function of a provider's table is there; a broker calls them without a look.
 bool is_complete(const CMPIInstanceMIFT &table) {
-    return table.cleanup && table.enumerateInstanceNames && table.enumerateInstances &&
-           table.getInstance && table.createInstance && table.modifyInstance &&
-           table.deleteInstance && table.execQuery;
+    return all_filled(table.cleanup, table.enumerateInstanceNames, table.enumerateInstances,
+                      table.getInstance, table.createInstance, table.modifyInstance,
+                      table.deleteInstance, table.execQuery);
 }
 bool is_complete(const CMPIAssociationMIFT &table) {
-    return table.cleanup && table.associators && table.associatorNames && table.references &&
-           table.referenceNames;
+    return all_filled(table.cleanup, table.associators, table.associatorNames, table.references,
+                      table.referenceNames);
 }
 bool is_complete(const CMPIMethodMIFT &table) {
-    return table.cleanup && table.invokeMethod;
+    return all_filled(table.cleanup, table.invokeMethod);
 }
 bool is_complete(const CMPIPropertyMIFT &table) {
-    return table.cleanup != nullptr;
+    return all_filled(table.cleanup);
 }
 bool is_complete(const CMPIIndicationMIFT &table) {
-    return table.cleanup && table.authorizeFilter && table.mustPoll && table.activateFilter &&
-           table.deActivateFilter && table.enableIndications && table.disableIndications;
+    return all_filled(table.cleanup, table.authorizeFilter, table.mustPoll, table.activateFilter,
+                      table.deActivateFilter, table.enableIndications, table.disableIndications);
 }
 
 class Loading {

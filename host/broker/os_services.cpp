@@ -4,7 +4,7 @@
 
 #include <pthread.h>
 
-#include <cstdint>
+#include <bit>
 #include <cstring>
 #include <memory>
 #include <mutex>
@@ -13,7 +13,6 @@
 namespace velkhost::broker {
 namespace {
 
-static_assert(sizeof(pthread_t) <= sizeof(CMPI_THREAD_TYPE));
 static_assert(sizeof(pthread_once_t) == sizeof(int));
 static_assert(sizeof(pthread_key_t) == sizeof(CMPI_THREAD_KEY_TYPE));
 
@@ -63,8 +62,7 @@ CMPI_THREAD_TYPE new_thread(CMPI_THREAD_RETURN (*entry)(void *), void *user, int
     pthread_t thread{};
     const int error = ::pthread_create(&thread, &attributes, entry, user);
     ::pthread_attr_destroy(&attributes);
-    return error == 0 ? reinterpret_cast<CMPI_THREAD_TYPE>(static_cast<std::uintptr_t>(thread))
-                      : nullptr;
+    return error == 0 ? std::bit_cast<CMPI_THREAD_TYPE>(thread) : nullptr;
 }
 
 int thread_once(int *control, void (*init)()) {

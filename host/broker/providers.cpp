@@ -24,8 +24,8 @@ Registration in_process_registration(std::string name, const ManagementInterface
 
 }  // namespace
 
-Provider::Provider(const Registration &registration)
-    : registration_(registration), in_process_(false) {}
+Provider::Provider(Registration registration)
+    : registration_(std::move(registration)), in_process_(false) {}
 
 Provider::Provider(std::string name, const ManagementInterfaces &interfaces)
     : registration_(in_process_registration(std::move(name), interfaces)),

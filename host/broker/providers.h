@@ -31,7 +31,7 @@ struct ManagementInterfaces {
 class Provider {
   public:
     // One that a library brings.
-    explicit Provider(const Registration &registration);
+    explicit Provider(Registration registration);
     // One that is in the process already.
     Provider(std::string name, const ManagementInterfaces &interfaces);
 
@@ -52,8 +52,9 @@ class Provider {
     [[nodiscard]] const Registration &registration() const { return registration_; }
     void add_kinds(ProviderKinds kinds) { registration_.kinds.add(kinds); }
 
-    // The clean-up's answers, kept between rounds.
-    std::atomic<bool> stays_for_ever = false;
+    // It has said that it is never to be asked to go again.
+    [[nodiscard]] bool stays_for_ever() const { return stays_for_ever_.load(); }
+    void stay_for_ever() { stays_for_ever_.store(true); }
 
   private:
     enum class State { kUnloaded, kLoading, kLoaded, kBroken };
@@ -65,6 +66,7 @@ class Provider {
     mutable std::recursive_mutex lock_;  // factories may call the broker
     State state_ = State::kUnloaded;
     Loaded loaded_;
+    std::atomic<bool> stays_for_ever_ = false;
 };
 using ProviderPointer = std::shared_ptr<Provider>;
 

@@ -26,8 +26,9 @@ std::optional<std::partial_ordering> compared(const cim::Value &value,
     const bool boolean_literal = comparison.literal_type == CMPI_booleanString;
     if (const auto boolean = value.as_bool()) {
         const bool literal = cim::same_name(comparison.literal, "true");
-        return boolean_literal ? std::optional<std::partial_ordering>(*boolean <=> literal)
-                               : std::nullopt;
+        return boolean_literal
+                   ? std::optional<std::partial_ordering>(int{*boolean} <=> int{literal})
+                   : std::nullopt;
     }
     const auto literal = cim::value_from_text(CMPI_real64, comparison.literal);
     if (boolean_literal || !literal) {

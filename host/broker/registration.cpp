@@ -69,7 +69,7 @@ class Parser {
         }
         const auto colon = line.find(':');
         if (colon == std::string_view::npos) {
-            return fail("expected [Class] or \"key: value\", found \"" + std::string(line) + '"');
+            return fail(R"(expected [Class] or "key: value", found ")" + std::string(line) + '"');
         }
         if (!open_) {
             return fail("an entry stands in front of the first [Class]");

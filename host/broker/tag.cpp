@@ -31,7 +31,8 @@ void Link::unlink() {
 
 Tag::Tag(Core &owner, ObjectKind object_kind, Custody object_custody, Origin object_origin,
          Undertaker bury_object, Undertaker destroy_object)
-    : core(owner),
+    : Link(this),
+      core(owner),
       ledger(*owner.ledger),
       kind(object_kind),
       custody(object_custody),

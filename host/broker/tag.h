@@ -50,12 +50,15 @@ struct Origin {
     std::string subject;     // class name, argument name, text: whatever tells it apart
 };
 
-// Place in the list of a thread's tracked objects.
+struct Tag;
+
+// Place in the ring of a thread's tracked objects; the ring's head has no tag.
 struct Link {
     Link *previous = this;
     Link *next = this;
+    Tag *const tag;
 
-    Link() = default;
+    explicit Link(Tag *owner = nullptr) : tag(owner) {}
     Link(const Link &) = delete;
     Link &operator=(const Link &) = delete;
     ~Link() = default;

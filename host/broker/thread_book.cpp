@@ -12,6 +12,9 @@ namespace {
 // The pages of one thread, one per broker that it has met.
 class Pages {
   public:
+    Pages() = default;
+    Pages(const Pages &) = delete;
+    Pages &operator=(const Pages &) = delete;
     ~Pages() {
         for (const auto &book : books_) {
             book->report_thread_end();
@@ -65,7 +68,7 @@ ThreadBook::~ThreadBook() {
 void ThreadBook::leave() {
     Link &frame = frames_.back();
     while (frame.previous != &frame) {
-        auto &tag = static_cast<Tag &>(*frame.previous);
+        Tag &tag = *frame.previous->tag;
         tag.unlink();
         ledger_->retire(tag, Life::kOver);
     }
@@ -75,7 +78,7 @@ void ThreadBook::leave() {
 void ThreadBook::report_thread_end() const {
     const Link &root = frames_.front();
     for (const Link *link = root.next; link != &root; link = link->next) {
-        const auto &tag = static_cast<const Tag &>(*link);
+        const Tag &tag = *link->tag;
         if (tag.kind == ObjectKind::kEnumeration) {
             ledger_->note(FindingKind::kEnumerationAtThreadEnd,
                           tag.describe() + " was not released before its thread ended");

@@ -44,7 +44,7 @@ bool is_empty(const ManagementInterfaces &interfaces) {
 std::optional<UnloadAnswer::Decision> ask_to_unload(Core &core, Provider &provider) {
     const ManagementInterfaces interfaces = provider.loaded();
     const Registration &registration = provider.registration();
-    if (is_empty(interfaces) || registration.never_unload || provider.stays_for_ever) {
+    if (is_empty(interfaces) || registration.never_unload || provider.stays_for_ever()) {
         return std::nullopt;
     }
     const CMPIrc rc = first_refusal(core, registration, interfaces);
@@ -52,9 +52,11 @@ std::optional<UnloadAnswer::Decision> ask_to_unload(Core &core, Provider &provid
         provider.forget();
         return UnloadAnswer::Decision::kUnloads;
     }
-    provider.stays_for_ever = rc == CMPI_RC_NEVER_UNLOAD;
-    return provider.stays_for_ever ? UnloadAnswer::Decision::kStaysForEver
-                                   : UnloadAnswer::Decision::kStays;
+    if (rc == CMPI_RC_NEVER_UNLOAD) {
+        provider.stay_for_ever();
+        return UnloadAnswer::Decision::kStaysForEver;
+    }
+    return UnloadAnswer::Decision::kStays;
 }
 
 void tell_shutdown(Core &core, Provider &provider) {

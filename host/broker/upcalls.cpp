@@ -102,6 +102,7 @@ CMPIEnumeration *exec_query(const CMPIBroker *broker, const CMPIContext *context
 
 // -- Associations --
 
+// NOLINTNEXTLINE(readability-function-size): the standard gives the slot nine parameters
 CMPIEnumeration *associators(const CMPIBroker *broker, const CMPIContext *context,
                              const CMPIObjectPath *path, const char *assoc_class,
                              const char *result_class, const char *role, const char *result_role,
