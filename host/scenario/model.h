@@ -98,7 +98,7 @@ struct FaultRule {
     std::string message;  // status message, for steps that carry one
     // With kCompletionCode `code` is that code, with kLate the seconds, with kLonger the bytes.
     ControllerFault controller = ControllerFault::kNone;
-    int line = 0;         // where the rule stands in its file; 0 when it comes from elsewhere
+    int line = 0;  // where the rule stands in its file; 0 when it comes from elsewhere
 };
 
 struct Description {
