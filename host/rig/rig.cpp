@@ -1,5 +1,6 @@
 #include "host/rig/rig.h"
 
+#include "host/bmc/scenario_device.h"
 #include "host/rig/broker_setup.h"
 #include "host/rig/library_state.h"
 #include "host/rig/shim_session.h"
@@ -122,6 +123,7 @@ struct Rig::State {
         folder.furnish(parts.libraries, scenario_text(options));
         broker = make_broker(parts, current.get());
         session.emplace(folder.path(), current.get(), virtual_clock, history);
+        controller.emplace(current.get());
     }
 
     [[nodiscard]] std::optional<LibraryState> library() const {
@@ -134,8 +136,10 @@ struct Rig::State {
     RunFolder folder;
     StatusHistory history;
     std::optional<ShimSession> session;
+    std::optional<bmc::ScenarioDevice> controller;
     std::unique_ptr<broker::Broker> broker;
     std::int64_t request_start_us = 0;
+    std::vector<bmc::Exchange> controller_trace;  // once the host is down
 };
 
 Rig::Rig(RigOptions options) : state_(std::make_unique<State>(options)) {
@@ -236,6 +240,10 @@ StatusHistory &Rig::history() {
     return state_->history;
 }
 
+std::vector<bmc::Exchange> Rig::controller_trace() const {
+    return state_->controller ? state_->controller->trace() : state_->controller_trace;
+}
+
 RunFolder &Rig::folder() {
     return state_->folder;
 }
@@ -256,6 +264,8 @@ bool Rig::shut_down() {
         return false;
     }
     state_->broker->shutdown();
+    state_->controller_trace = state_->controller->trace();
+    state_->controller.reset();
     state_->session.reset();
     return true;
 }

@@ -14,6 +14,7 @@
 // `wait_until_idle`, pauses, or is in a velkhost::shim::WaitGuard; that makes runs repeatable.
 #pragma once
 
+#include "host/bmc/trace.h"
 #include "host/broker/broker.h"
 #include "host/rig/parts.h"
 #include "host/rig/rig_error.h"
@@ -103,6 +104,8 @@ class Rig {
     [[nodiscard]] broker::Broker &broker();
     [[nodiscard]] scenario::Scenario &scenario();
     [[nodiscard]] StatusHistory &history();
+    // What host and management controller said to each other so far, with the host's time.
+    [[nodiscard]] std::vector<bmc::Exchange> controller_trace() const;
     [[nodiscard]] RunFolder &folder();
     [[nodiscard]] const RunFolder &folder() const;
     [[nodiscard]] std::filesystem::path library_path() const;  // as the broker loads it
