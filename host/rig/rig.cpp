@@ -195,16 +195,16 @@ bool Rig::wait_until_idle(std::chrono::microseconds limit, const std::function<v
     return true;
 }
 
-std::vector<PackageStatus> Rig::results() const {
-    const auto library = state_->library();
-    if (library && library->running_installs() == 0) {
-        return library->results();
 std::int64_t Rig::last_activity_us() const {
     // A log that cannot be written tells nothing.
     const std::int64_t last = state_->session ? state_->session->last_log_us() : 0;
     return last == 0 ? host_now_us() : last;
 }
 
+std::vector<PackageStatus> Rig::results() const {
+    const auto library = state_->library();
+    if (library && library->running_installs() == 0) {
+        return library->results();
     }
     const auto entries = state_->history.entries();
     return entries.empty() ? std::vector<PackageStatus>{} : entries.back().line.packages;

@@ -88,11 +88,11 @@ class Rig {
     bool wait_until_idle(std::chrono::microseconds limit,
                          const std::function<void()> &on_tick = {});
 
-    // The packages of the latest request as the library left them, in its order; while an install
     // When the library last did anything, by its debug log: the exact end of a request that is
     // over, whenever that was noticed. Microseconds since 1970-01-01 UTC.
     [[nodiscard]] std::int64_t last_activity_us() const;
 
+    // The packages of the latest request as the library left them, in its order; while an install
     // thread is at work, as its last status line has them.
     [[nodiscard]] std::vector<PackageStatus> results() const;
 
