@@ -6,6 +6,8 @@ add_executable(velkshim_preload_program ${VELKSHIM_TEST_FOLDER}/shim_preload_pro
 foreach(target velkshim_test_library velkshim_test_caller)
   target_link_libraries(${target} PRIVATE velk_options)
 endforeach()
+# Its call must not become a jump, or it would not be the caller any more.
+target_compile_options(velkshim_test_caller PRIVATE -fno-optimize-sibling-calls)
 set_target_properties(velkshim_test_library PROPERTIES
   LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib/neighbour)
 set_target_properties(velkshim_test_caller PROPERTIES

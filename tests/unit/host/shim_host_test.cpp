@@ -99,7 +99,7 @@ TEST_F(ShimLibraries, BareNameIsSearchedForOnTheRunPathOfTheCaller) {
     const auto open_neighbour = reinterpret_cast<void *(*)()>(dlsym(caller, "open_neighbour"));
     ASSERT_NE(open_neighbour, nullptr);
     void *const neighbour = open_neighbour();
-    EXPECT_NE(neighbour, nullptr) << dlerror();
+    ASSERT_NE(neighbour, nullptr) << dlerror();
     dlclose(neighbour);
     dlclose(caller);
 }
