@@ -11,6 +11,7 @@ import hashlib
 import json
 import os
 import pathlib
+import re
 import shlex
 import subprocess
 import sys
@@ -20,11 +21,22 @@ ROOT = pathlib.Path(__file__).resolve().parent.parent
 BUILD = ROOT / "build" / "release"
 MEMORY = ROOT / "build" / "tidy"
 TOOL = "clang-tidy-14"
+PRECOMPILED = re.compile(r' -Winvalid-pch| -include ("[^"]*cmake_pch\.hxx"|\S*cmake_pch\.hxx)')
+
+
+def compile_commands():
+    """As the release build has them, but for the compiler's own precompiled headers; a copy is left
+    where the tool finds it."""
+    commands = json.loads((BUILD / "compile_commands.json").read_text())
+    for command in commands:
+        command["command"] = PRECOMPILED.sub("", command["command"])
+    (MEMORY / "compile_commands.json").write_text(json.dumps(commands))
+    return commands
 
 
 def own_sources(only):
     """Compile commands of our sources, the largest first: long ones must not start last."""
-    commands = json.loads((BUILD / "compile_commands.json").read_text())
+    commands = compile_commands()
     own = {}
     for command in commands:
         path = pathlib.Path(command["file"])
@@ -62,7 +74,7 @@ def look_at(command, settings):
     mark = MEMORY / digest_of(command, settings)
     if mark.exists():
         return file, "", 0.0
-    result = subprocess.run([TOOL, "-p", str(BUILD), "--quiet", "--extra-arg=-Wno-unknown-warning-option", file],
+    result = subprocess.run([TOOL, "-p", str(MEMORY), "--quiet", "--extra-arg=-Wno-unknown-warning-option", file],
                             stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True, check=False)
     seconds = time.monotonic() - start
     if result.returncode == 0:
