@@ -129,7 +129,8 @@ TEST_F(Request, ThatIsAcceptedReturnsItsJob) {
                   "", "velk/cimv2", "ZEB_ConcreteJob", {{"InstanceID", Value::string("VELK-1")}}}));
     EXPECT_TRUE(host().log().ends_with(
         entries({"Create new thread success.\n", "Job accomplished.\n"}, 1) +
-        entry("Complete ZEB_VMWarePackageInstallationProviderInvokeMethod.\n", 1)));
+        entry("Complete ZEB_VMWarePackageInstallationProviderInvokeMethod.\n", 1)))
+        << host().log();
 }
 
 // -- InstallOptions --
@@ -138,6 +139,10 @@ struct OptionsCase {
     const char *name;
     std::vector<NamedValue> options;
 };
+
+void PrintTo(const OptionsCase &row, std::ostream *out) {
+    *out << row.name;
+}
 
 class RequestForAsynchronous : public Request, public testing::WithParamInterface<OptionsCase> {};
 
