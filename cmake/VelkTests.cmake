@@ -19,7 +19,7 @@ function(velk_add_tests name)
   target_link_libraries(${name} PRIVATE velk_options ${ARG_LIBS} gmock_main)
   # Most of a test's time in the compiler goes to GoogleTest's headers and to the optimiser.
   target_precompile_headers(${name} PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
-  target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O1>)
+  target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
   gtest_discover_tests(${name} TEST_PREFIX "${ARG_LABEL}." DISCOVERY_TIMEOUT 120
     PROPERTIES LABELS "${ARG_LABEL}" TIMEOUT 120)
 endfunction()
