@@ -110,6 +110,7 @@ MethodAnswer start_install(const Invocation &invocation) {
     log_entry("Create new thread success.\n");
     pthread_detach(thread);
     return_job(invocation);
+    log_entry("Job accomplished.\n");
     return {.return_value = kJobStarted};
 }
 
