@@ -23,7 +23,8 @@ std::string entries(const std::vector<std::string_view> &messages, int elapsed) 
 
 int occurrences(std::string_view text, std::string_view part) {
     int count = 0;
-    for (std::size_t at = text.find(part); at != text.npos; at = text.find(part, at + 1)) {
+    for (std::size_t at = text.find(part); at != std::string_view::npos;
+         at = text.find(part, at + 1)) {
         ++count;
     }
     return count;

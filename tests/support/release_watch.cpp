@@ -5,6 +5,12 @@
 namespace velktest {
 namespace {
 
+// The tables' functions find the watch by no other way: there is one at a time.
+const CMPIBroker *real = nullptr;
+std::vector<CMPIObjectPath *> paths;
+std::vector<CMPIInstance *> instances;
+std::vector<CMPIArgs *> args;
+
 template <class Object>
 Object *noted(std::vector<Object *> &list, Object *object) {
     if (object != nullptr) {
@@ -36,14 +42,9 @@ void take_alive(std::vector<Object *> &list, const char *kind, std::vector<std::
 
 }  // namespace
 
-const CMPIBroker *ReleaseWatch::real_ = nullptr;
-std::vector<CMPIObjectPath *> ReleaseWatch::paths_;
-std::vector<CMPIInstance *> ReleaseWatch::instances_;
-std::vector<CMPIArgs *> ReleaseWatch::args_;
-
 ReleaseWatch::ReleaseWatch(const CMPIBroker *broker)
     : factory_(*broker->eft), up_calls_(*broker->bft), face_(*broker) {
-    real_ = broker;
+    real = broker;
     factory_.newObjectPath = &new_path;
     factory_.newInstance = &new_instance;
     factory_.newArgs = &new_args;
@@ -54,30 +55,30 @@ ReleaseWatch::ReleaseWatch(const CMPIBroker *broker)
 
 std::vector<std::string> ReleaseWatch::unreleased() {
     std::vector<std::string> alive;
-    take_alive(paths_, "path", alive);
-    take_alive(instances_, "instance", alive);
-    take_alive(args_, "argument list", alive);
+    take_alive(paths, "path", alive);
+    take_alive(instances, "instance", alive);
+    take_alive(args, "argument list", alive);
     return alive;
 }
 
 CMPIObjectPath *ReleaseWatch::new_path(const CMPIBroker *, const char *name_space,
                                        const char *class_name, CMPIStatus *status) {
-    return noted(paths_, real_->eft->newObjectPath(real_, name_space, class_name, status));
+    return noted(paths, real->eft->newObjectPath(real, name_space, class_name, status));
 }
 
 CMPIInstance *ReleaseWatch::new_instance(const CMPIBroker *, const CMPIObjectPath *path,
                                          CMPIStatus *status) {
-    return noted(instances_, real_->eft->newInstance(real_, path, status));
+    return noted(instances, real->eft->newInstance(real, path, status));
 }
 
 CMPIArgs *ReleaseWatch::new_args(const CMPIBroker *, CMPIStatus *status) {
-    return noted(args_, real_->eft->newArgs(real_, status));
+    return noted(args, real->eft->newArgs(real, status));
 }
 
 CMPIInstance *ReleaseWatch::get_instance(const CMPIBroker *, const CMPIContext *context,
                                          const CMPIObjectPath *path, const char **properties,
                                          CMPIStatus *status) {
-    return noted(instances_, real_->bft->getInstance(real_, context, path, properties, status));
+    return noted(instances, real->bft->getInstance(real, context, path, properties, status));
 }
 
 }  // namespace velktest

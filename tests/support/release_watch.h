@@ -9,7 +9,8 @@
 namespace velktest {
 
 // Stands in front of a broker that tells released objects apart (a strict ledger). Notes every
-// path, instance and argument list that is made or got through it; for one thread.
+// path, instance and argument list that is made or got through it; for one thread, and one watch at
+// a time.
 class ReleaseWatch {
   public:
     explicit ReleaseWatch(const CMPIBroker *broker);
@@ -32,11 +33,6 @@ class ReleaseWatch {
     static CMPIInstance *get_instance(const CMPIBroker *broker, const CMPIContext *context,
                                       const CMPIObjectPath *path, const char **properties,
                                       CMPIStatus *status);
-
-    static const CMPIBroker *real_;
-    static std::vector<CMPIObjectPath *> paths_;
-    static std::vector<CMPIInstance *> instances_;
-    static std::vector<CMPIArgs *> args_;
 
     CMPIBrokerEncFT factory_;
     CMPIBrokerFT up_calls_;

@@ -73,7 +73,7 @@ class UpdateJob : public DoubleBase {
     // `status` is its JobStatus; null for none; no value for a job that cannot be had.
     void show(kit::Value status) { looks_.push_back(Look{{"JobStatus", std::move(status)}}); }
     void show_nothing() { looks_.push_back(Look{}); }
-    void hide() { looks_.push_back(std::nullopt); }
+    void hide() { looks_.emplace_back(); }
 
     // Whether every look was taken.
     [[nodiscard]] bool is_over() const { return looks_.empty(); }

@@ -11,7 +11,7 @@ namespace {
 
 template <class Global>
 std::span<char> bytes(Global &global) {
-    return {reinterpret_cast<char *>(&global), sizeof global};
+    return {reinterpret_cast<char *>(&global), sizeof(Global)};
 }
 
 }  // namespace

@@ -1,12 +1,29 @@
 // Requests side by side, and the threads, mutexes and conditions that providers get.
 #include "broker_testing.h"
 
+#include "host/shim/velkshim.h"
+
 #include <atomic>
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
 #include <latch>
 #include <thread>
+
+namespace {
+
+std::atomic<int> waits_begun{0};
+std::atomic<int> waits_ended{0};
+
+}  // namespace
+
+// In place of the shim's: a wait for a request's thread is announced to its clock.
+void velkshim_wait_begin() {
+    ++waits_begun;
+}
+void velkshim_wait_end() {
+    ++waits_ended;
+}
 
 namespace velkhost::broker::testing {
 namespace {
@@ -93,6 +110,24 @@ TEST_F(BrokerThreads, ClassesAndProvidersCanBeAddedMeanwhile) {
         EXPECT_EQ(broker.repository().add_class(kNamespace, more), "");
         broker.register_provider(kNamespace, more.name, provider.methods());
     }
+}
+
+TEST_F(BrokerThreads, WaitForAFreshThreadIsAnnouncedToTheClock) {
+    const int before = waits_begun;
+    int inside = 0;
+    provider.invoke = [&](const auto *, const auto *, const auto *, const char *, const auto *,
+                          auto *) {
+        while (waits_begun == before) {
+            std::this_thread::yield();
+        }
+        inside = waits_begun - waits_ended;
+        return ok();
+    };
+    broker.register_provider(kNamespace, "Test_Service", provider.methods());
+    broker.invoke_method(path_of("Test_Service"), "Run", {},
+                         {.principal = "root", .flags = 0, .thread = RequestThread::kFresh});
+    EXPECT_EQ(inside, 1);
+    EXPECT_EQ(waits_begun, waits_ended);
 }
 
 // -- Services for providers' threads --

@@ -13,7 +13,8 @@ namespace {
 class BoundedText : public ::testing::Test {
   protected:
     BoundedText() { room_.fill('x'); }
-    ~BoundedText() override {
+
+    void TearDown() override {
         EXPECT_EQ(guard(0), "xxxx");
         EXPECT_EQ(guard(12), "xxxx");
     }

@@ -12,13 +12,13 @@ inline std::string value_line(const std::string &value) {
 
 inline std::string property(const std::string &name, const std::string &value) {
     const std::string type = name == "type" ? "uint16" : "string";
-    return "  <PROPERTY NAME=\"" + name + "\" TYPE=\"" + type + "\">\n" + value_line(value) +
+    return R"(  <PROPERTY NAME=")" + name + R"(" TYPE=")" + type + "\">\n" + value_line(value) +
            "  </PROPERTY>\n";
 }
 
 inline std::string array(const std::string &name, const std::vector<std::string> &values) {
     std::string text =
-        "  <PROPERTY.ARRAY NAME=\"" + name + "\" TYPE=\"string\">\n    <VALUE.ARRAY>\n";
+        R"(  <PROPERTY.ARRAY NAME=")" + name + "\" TYPE=\"string\">\n    <VALUE.ARRAY>\n";
     for (const std::string &value : values) {
         text += value_line(value);
     }

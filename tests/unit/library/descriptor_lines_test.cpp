@@ -24,7 +24,7 @@ TEST_F(DescriptorLines, IndentedLinesAreRecognisedHoweverTheyEnd) {
     };
     for (const auto &row : cases) {
         set_field(package().Name, "");
-        parse(std::string(row.before) + "<PROPERTY NAME=\"Name\" TYPE=\"string\">" + row.after +
+        parse(std::string(row.before) + R"(<PROPERTY NAME="Name" TYPE="string">)" + row.after +
               row.before + "<VALUE>N</VALUE>" + row.after);
         EXPECT_STREQ(package().Name, "N") << row.before << row.after;
     }
@@ -40,7 +40,7 @@ TEST_F(DescriptorLines, HeaderInTheFirstColumnIsNeverRecognised) {
 
 TEST_F(DescriptorLines, HeaderInTheFirstColumnOfALastLineWithoutABreakIsRecognised) {
     set_field(package().Name, "left");
-    parse("<PROPERTY NAME=\"Name\" TYPE=\"string\">");
+    parse(R"(<PROPERTY NAME="Name" TYPE="string">)");
     EXPECT_STREQ(package().Name, "") << "but no value follows it";
 }
 
@@ -80,8 +80,8 @@ TEST_F(DescriptorLines, WhateverFollowsAHeaderIsItsValueLine) {
         {"    <VALUE/>\n", ""},  // shorter than the two tags
         {"\n", ""},
         {"    plain text without tags\n", ""},
-        {"    <VALUE>N</VALUE></PROPERTY>\n", "N</VALUE></P"},  // 8 characters of whatever
-        {"    <VALUE TYPE=\"x\">N</VALUE>\n", "TYPE=\"x\">N"},  // and the 7 before it
+        {"    <VALUE>N</VALUE></PROPERTY>\n", "N</VALUE></P"},   // 8 characters of whatever
+        {"    <VALUE TYPE=\"x\">N</VALUE>\n", R"(TYPE="x">N)"},  // and the 7 before it
     };
     for (const auto &row : cases) {
         set_field(package().Name, "left");
@@ -94,7 +94,7 @@ TEST_F(DescriptorLines, HeaderThatStandsInPlaceOfAValueIsNotTakenForAHeader) {
     parse(std::string(kNameHeader) + "  <PROPERTY NAME=\"category\" TYPE=\"string\">\n" +
           value_line("UEFI"));
     EXPECT_STREQ(package().category, "");
-    EXPECT_STREQ(package().Name, "TY NAME=\"category\" TYPE=\"");
+    EXPECT_STREQ(package().Name, R"(TY NAME="category" TYPE=")");
 }
 
 TEST_F(DescriptorLines, FileThatEndsBehindAHeaderGivesAnEmptyValue) {
@@ -111,7 +111,7 @@ TEST_F(DescriptorLines, ValueOfALastLineWithoutABreakIsTaken) {
 }
 
 TEST_F(DescriptorLines, LongValuesAreCutAt199Characters) {
-    for (const std::size_t length : {198, 199, 200, 1000}) {
+    for (const std::size_t length : {198U, 199U, 200U, 1000U}) {
         SCOPED_TRACE(length);
         const std::string value(length, 'v');
         const std::string cut = value.substr(0, 199);
@@ -137,7 +137,7 @@ TEST_F(DescriptorLines, LongValuesAreCutAt199Characters) {
 TEST_F(DescriptorLines, LinesInsideAPropertyAreReadUpTo1023Characters) {
     // A value line of exactly 1023 characters with its break, and one of 1024, whose break is then
     // a line of its own.
-    for (const std::size_t length : {1023, 1024}) {
+    for (const std::size_t length : {1023U, 1024U}) {
         SCOPED_TRACE(length);
         set_field(package().category, "");
         const std::string frame = " <VALUE></VALUE>\n";
@@ -160,7 +160,7 @@ TEST_F(DescriptorLines, RestOfALongerValueLineIsALineOfItsOwn) {
 
 TEST_F(DescriptorLines, LinesOfTheFileAreReadUpTo20479Characters) {
     const std::string header = "  <PROPERTY NAME=\"Name\" TYPE=\"string\">\n";
-    for (const std::size_t before : {20479, 20480}) {
+    for (const std::size_t before : {20479U, 20480U}) {
         SCOPED_TRACE(before);
         set_field(package().Name, "left");
         parse(std::string(before, ' ') + header + value_line("N"));

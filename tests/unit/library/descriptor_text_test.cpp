@@ -16,7 +16,7 @@ template <class Function>
 std::string applied(Function function, const std::string &text) {
     std::string copy = text;
     function(copy.data());
-    return copy.c_str();
+    return copy.substr(0, copy.find('\0'));
 }
 
 }  // namespace

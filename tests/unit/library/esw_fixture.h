@@ -32,7 +32,8 @@ class SystemFirmwareTest : public BrokerTest {
         std::vector<std::string> found;
         const std::string text = log();
         constexpr std::string_view kMark = "] rxc: ";
-        for (std::size_t at = text.find(kMark); at != text.npos; at = text.find(kMark, at + 1)) {
+        for (std::size_t at = text.find(kMark); at != std::string::npos;
+             at = text.find(kMark, at + 1)) {
             const std::size_t begin = at + kMark.size();
             found.push_back(text.substr(begin, text.find('\n', begin) - begin));
         }

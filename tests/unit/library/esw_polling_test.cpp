@@ -116,7 +116,7 @@ TEST_F(SystemFirmwareJob, StatusWithoutABarIsAllText) {
 }
 
 TEST_F(SystemFirmwareJob, LongStatusIsCutAndUnknown) {
-    for (const std::size_t length : {1022, 1023, 1024, 5000}) {
+    for (const std::size_t length : {1022U, 1023U, 1024U, 5000U}) {
         EXPECT_EQ(end_of("0x00|" + std::string(length, 'x'), 1), kError) << length;
         EXPECT_EQ(end_of(std::string(length, '1') + "|Process Completed", 1), kError) << length;
     }

@@ -33,7 +33,7 @@ TEST_F(SystemFirmwareStart, PayloadsLocationIsSentAndTheServiceIsNotEnumerated) 
     refuse();
     install();
     EXPECT_EQ(up_calls(), (Texts{"invokeMethod zeb/cimv2:ZEB_SoftwareInstallationService."
-                                 "InstallFromURI(URI=\"file:///pkgs/fw.bin\", Update_Operation=0, "
+                                 R"(InstallFromURI(URI="file:///pkgs/fw.bin", Update_Operation=0, )"
                                  "reboot_option=1)"}));
 }
 
@@ -95,7 +95,7 @@ TEST_F(SystemFirmwareStart, FailedStatusOutweighsTheRightValue) {
 }
 
 TEST_F(SystemFirmwareStart, LongMessageIsCut) {
-    for (const std::size_t length : {163, 1023, 1024, 5000}) {
+    for (const std::size_t length : {163U, 1023U, 1024U, 5000U}) {
         SCOPED_TRACE(length);
         const std::string message(length, 'x');
         controller().end = {CMPI_RC_ERR_FAILED, message, 0, {}};

@@ -45,7 +45,7 @@ TEST_F(Fetch, RequestsKindDecidesNotTheLocation) {
 
 TEST_F(Fetch, LongLocationIsCutAt199Characters) {
     filelocation = 1;
-    for (const std::size_t length : {199, 200, 1023, 5000}) {
+    for (const std::size_t length : {199U, 200U, 1023U, 5000U}) {
         const std::string location(length, 'a');
         EXPECT_EQ(fetch(1, location.c_str()), 1);
         EXPECT_EQ(pkgInstance[1].LocalPkgURI, location.substr(0, 199));
@@ -89,7 +89,7 @@ TEST_F(Fetch, NullLocationCountsAsEmpty) {
 TEST_F(Fetch, RemovalIsAskedOfTheTransferServiceAlsoForLocalFiles) {
     remove("file:///pkgs/x.xml");
     EXPECT_EQ(up_calls(), (Texts{"invokeMethod zeb/cimv2:ZEB_FileTransferService."
-                                 "DeleteTransferredFile(FileURI=\"file:///pkgs/x.xml\")"}));
+                                 R"(DeleteTransferredFile(FileURI="file:///pkgs/x.xml"))"}));
     EXPECT_EQ(transfer().deleted, Texts{"file:///pkgs/x.xml"});
     EXPECT_EQ(log(), entry("Delete file ") + "file:///pkgs/x.xml\n" +
                          entry("Complete deleteTransferedFile.\n"));

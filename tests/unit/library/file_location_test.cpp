@@ -33,7 +33,7 @@ TEST_F(FileLocation, ZeroOfFourBytesIsWrittenAtTheEndOfTheBuffer) {
 }
 
 TEST_F(FileLocation, AtMost1024CharactersAreStored) {
-    for (const std::size_t length : {1023, 1024, 1025, 5000}) {
+    for (const std::size_t length : {1023U, 1024U, 1025U, 5000U}) {
         SCOPED_TRACE(length);
         std::ranges::fill(update_file_location, 'x');
         const std::string text(length, 'a');

@@ -107,7 +107,7 @@ TEST_F(JobCallbacks, MessageIsCutToTheCallersBufferAndTerminated) {
         std::string buffer(size + 8, 'x');
         int job_state = kUntouched;
         getVELKStatus("VELK-7", &job_state, buffer.data(), static_cast<int>(size));
-        EXPECT_EQ(std::string(buffer.c_str()), line.substr(0, size - 1));
+        EXPECT_EQ(buffer.substr(0, buffer.find('\0')), line.substr(0, size - 1));
         EXPECT_EQ(buffer[size - 1], '\0') << "the last byte is always the terminator";
         EXPECT_EQ(buffer.substr(size), std::string(8, 'x'));
         EXPECT_EQ(job_state, 7) << "the state comes from the line, not from what fits";

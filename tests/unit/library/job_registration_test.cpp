@@ -24,7 +24,7 @@ class JobRegistration : public velktest::RequestTest {
         std::filesystem::create_symlink(VELK_FAKE_JOB_LIBRARY, library);
         fail_step("thread.create", EAGAIN);
     }
-    ~JobRegistration() override { create_job = nullptr; }
+    void TearDown() override { create_job = nullptr; }
 };
 
 int name_job(char *id, const char *name) {

@@ -14,7 +14,7 @@ namespace {
 std::string trimmed(const std::string &location) {
     std::string text = location;
     trimPackageID(text.data());
-    return text.c_str();
+    return text.substr(0, text.find('\0'));
 }
 
 }  // namespace

@@ -179,12 +179,16 @@ TEST_F(PackageList, EmptyElementsGiveRecordsOfTheirOwn) {
 }
 
 TEST_F(PackageList, LocationsAreCutAt199Characters) {
-    for (const std::size_t length : {198, 199, 200, 1023, 5000}) {
+    for (const std::size_t length : {198U, 199U, 200U, 1023U, 5000U}) {
         SCOPED_TRACE(length);
         velktest::reset_session();
         const std::string long_one = "file:///" + std::string(length - 8, 'a');
         const std::string untouched = record_image(3);
-        init(long_one + "|" + long_one + "|" + long_one);
+        std::string list = long_one;
+        for (int i = 1; i < 3; ++i) {
+            list.append("|").append(long_one);
+        }
+        init(list);
         for (int i = 0; i < 3; ++i) {
             EXPECT_EQ(location(i), long_one.substr(0, 199));
             EXPECT_EQ(folder(i), "file:///");

@@ -13,7 +13,7 @@ namespace cim = velkhost::cim;
 class ServiceInstance : public velktest::RequestTest {
   protected:
     ServiceInstance() { velkshim_set_node_name("esx-17.example"); }
-    ~ServiceInstance() override { velkshim_set_node_name(nullptr); }
+    void TearDown() override { velkshim_set_node_name(nullptr); }
 
     static cim::NamedValues texts(const std::string &name,
                                   const std::string &node = "esx-17.example") {

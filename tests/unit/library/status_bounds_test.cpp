@@ -37,7 +37,7 @@ TEST_F(StatusBounds, ResultIsCutAt199Characters) {
     use_packages(3);
     set_field(pkgInstance[1].TFTPXMLPkgURIs, "a/pkg.xml");
     const std::string prefix = "pkg: 57: ";
-    for (const std::size_t length : {189, 190, 191, 199, 200, 1023, 1024, 5000}) {
+    for (const std::size_t length : {189U, 190U, 191U, 199U, 200U, 1023U, 1024U, 5000U}) {
         SCOPED_TRACE(length);
         const std::string message(length, 'x');
         const std::string before = record_image(0);
