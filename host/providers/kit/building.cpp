@@ -24,8 +24,8 @@ const CMPIValue *chars(const Text &text) {
 
 CMPIDateTime *make(const Maker &maker, const DateTime &time) {
     CMPIStatus made{CMPI_RC_OK, nullptr};
-    CMPIDateTime *out = CMNewDateTimeFromBinary(
-        maker.broker, time.micros, static_cast<CMPIBoolean>(time.is_interval), &made);
+    CMPIDateTime *out = CMNewDateTimeFromBinary(maker.broker, time.micros,
+                                                static_cast<CMPIBoolean>(time.is_interval), &made);
     check(made, "a date");
     return out;
 }
