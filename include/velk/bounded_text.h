@@ -18,7 +18,9 @@ inline std::size_t put(std::span<char> buffer, std::size_t offset, std::string_v
         return offset;
     }
     const std::string_view fitting = text.substr(0, buffer.size() - 1 - offset);
-    std::memmove(buffer.data() + offset, fitting.data(), fitting.size());
+    if (!fitting.empty()) {  // an empty text may have no address
+        std::memmove(buffer.data() + offset, fitting.data(), fitting.size());
+    }
     buffer[offset + fitting.size()] = '\0';
     return offset + fitting.size();
 }
@@ -45,7 +47,9 @@ inline std::size_t append(std::span<char> buffer, std::string_view text) {
 // buffer is never written and stays the terminator that it was at load.
 inline void overlay(std::span<char> buffer, std::string_view text) {
     const std::string_view fitting = text.substr(0, buffer.size() - 1);
-    std::memcpy(buffer.data(), fitting.data(), fitting.size());
+    if (!fitting.empty()) {
+        std::memcpy(buffer.data(), fitting.data(), fitting.size());
+    }
 }
 
 // Formats at `offset` as snprintf does; returns the length of the text that the buffer then holds.
