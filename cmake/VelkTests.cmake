@@ -20,6 +20,7 @@ function(velk_add_tests name)
   # Most of a test's time in the compiler goes to GoogleTest's headers and to the optimiser.
   target_precompile_headers(${name} PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
   target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
-  gtest_discover_tests(${name} TEST_PREFIX "${ARG_LABEL}." DISCOVERY_TIMEOUT 120
+  # A parameter's value would bring addresses into the names.
+  gtest_discover_tests(${name} TEST_PREFIX "${ARG_LABEL}." NO_PRETTY_VALUES DISCOVERY_TIMEOUT 120
     PROPERTIES LABELS "${ARG_LABEL}" TIMEOUT 120)
 endfunction()
