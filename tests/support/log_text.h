@@ -18,6 +18,10 @@ std::string entry(std::string_view message, int elapsed = 0);
 // The same for several entries that follow each other.
 std::string entries(const std::vector<std::string_view> &messages, int elapsed = 0);
 
+// Entries of the session's log, which are dated, each on a line of its own.
+std::string dated(std::string_view message, int elapsed = 0);
+std::string dated(const std::vector<std::string_view> &messages, int elapsed = 0);
+
 // How often `part` occurs in `text`.
 int occurrences(std::string_view text, std::string_view part);
 

@@ -14,6 +14,16 @@ std::string report_log(const Report &report) {
            entry(id + ": " + std::to_string(report.code) + ": " + message + "\n", report.elapsed);
 }
 
+std::vector<std::string> reports_in(std::string_view log, std::string_view id) {
+    std::vector<std::string> found;
+    const std::string mark = "] " + std::string(id) + ": ";
+    for (std::size_t at = log.find(mark); at != std::string_view::npos; at = log.find(mark, at)) {
+        at += mark.size();
+        found.emplace_back(log.substr(at, log.find('\n', at) - at));
+    }
+    return found;
+}
+
 std::string job_file_log(std::string_view file, std::string_view line, int elapsed) {
     return entry("Write current status into file", elapsed) + std::string(file) +
            " for async installation.\n" + entry("Current result:", elapsed) + std::string(line) +

@@ -3,6 +3,7 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace velktest {
 
@@ -19,5 +20,8 @@ std::string report_log(const Report &report);
 
 // What comes after that for an asynchronous one.
 std::string job_file_log(std::string_view file, std::string_view line, int elapsed = 0);
+
+// Codes and messages of the reports of package `id` in a log, in their order: "50: Done.".
+std::vector<std::string> reports_in(std::string_view log, std::string_view id);
 
 }  // namespace velktest

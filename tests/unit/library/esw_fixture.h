@@ -3,6 +3,7 @@
 
 #include "installers/ESW_update.h"
 #include "tests/support/broker_test.h"
+#include "tests/support/report_log.h"
 #include "velk/request_state.h"
 
 namespace velktest {
@@ -28,17 +29,7 @@ class SystemFirmwareTest : public BrokerTest {
     }
 
     // Codes and messages of the reports so far, in their order.
-    [[nodiscard]] std::vector<std::string> reports() const {
-        std::vector<std::string> found;
-        const std::string text = log();
-        constexpr std::string_view kMark = "] rxc: ";
-        for (std::size_t at = text.find(kMark); at != std::string::npos;
-             at = text.find(kMark, at + 1)) {
-            const std::size_t begin = at + kMark.size();
-            found.push_back(text.substr(begin, text.find('\n', begin) - begin));
-        }
-        return found;
-    }
+    [[nodiscard]] std::vector<std::string> reports() const { return reports_in(log(), "rxc"); }
 };
 
 }  // namespace velktest

@@ -2,6 +2,7 @@
 if(TARGET velkbmc_device)
   velk_add_tests(library_ipmi_tests LABEL unit.library
     SOURCES
+      controller_stand.cpp
       ipmi_answer_test.cpp
       ipmi_builders_test.cpp
       ipmi_calls.cpp

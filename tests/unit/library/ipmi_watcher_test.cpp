@@ -1,7 +1,6 @@
 // The session around an install and its watcher thread: what both do, in hours of virtual time.
 #include "installers/adapter_session.h"
 
-#include <algorithm>
 #include <array>
 
 #include <pthread.h>
@@ -48,12 +47,6 @@ class IpmiWatcher : public IpmiTest {
     ~IpmiWatcher() override {
         velk::store(ga_is_thread_running, 0);
         sleep(61);  // the last watcher ends
-    }
-
-    [[nodiscard]] int status_queries() const {
-        const auto all = exchanges();
-        return static_cast<int>(std::ranges::count_if(
-            all, [](const std::string &words) { return words.starts_with("status "); }));
     }
 
     [[nodiscard]] int logged(std::string_view message) const {
