@@ -10,6 +10,8 @@ const CMPIBroker *real = nullptr;
 std::vector<CMPIObjectPath *> paths;
 std::vector<CMPIInstance *> instances;
 std::vector<CMPIArgs *> args;
+std::vector<CMPIArray *> arrays;
+std::vector<CMPIEnumeration *> enumerations;
 
 template <class Object>
 Object *noted(std::vector<Object *> &list, Object *object) {
@@ -48,7 +50,10 @@ ReleaseWatch::ReleaseWatch(const CMPIBroker *broker)
     factory_.newObjectPath = &new_path;
     factory_.newInstance = &new_instance;
     factory_.newArgs = &new_args;
+    factory_.newArray = &new_array;
     up_calls_.getInstance = &get_instance;
+    up_calls_.enumerateInstances = &enumerate;
+    up_calls_.associators = &associators;
     face_.eft = &factory_;
     face_.bft = &up_calls_;
 }
@@ -58,6 +63,8 @@ std::vector<std::string> ReleaseWatch::unreleased() {
     take_alive(paths, "path", alive);
     take_alive(instances, "instance", alive);
     take_alive(args, "argument list", alive);
+    take_alive(arrays, "array", alive);
+    take_alive(enumerations, "enumeration", alive);
     return alive;
 }
 
@@ -79,6 +86,28 @@ CMPIInstance *ReleaseWatch::get_instance(const CMPIBroker *, const CMPIContext *
                                          const CMPIObjectPath *path, const char **properties,
                                          CMPIStatus *status) {
     return noted(instances, real->bft->getInstance(real, context, path, properties, status));
+}
+
+CMPIArray *ReleaseWatch::new_array(const CMPIBroker *, CMPICount count, CMPIType type,
+                                   CMPIStatus *status) {
+    return noted(arrays, real->eft->newArray(real, count, type, status));
+}
+
+CMPIEnumeration *ReleaseWatch::enumerate(const CMPIBroker *, const CMPIContext *context,
+                                         const CMPIObjectPath *path, const char **properties,
+                                         CMPIStatus *status) {
+    return noted(enumerations,
+                 real->bft->enumerateInstances(real, context, path, properties, status));
+}
+
+CMPIEnumeration *ReleaseWatch::associators(const CMPIBroker *, const CMPIContext *context,
+                                           const CMPIObjectPath *source, const char *association,
+                                           const char *result_class, const char *role,
+                                           const char *result_role, const char **properties,
+                                           CMPIStatus *status) {
+    return noted(enumerations,
+                 real->bft->associators(real, context, source, association, result_class, role,
+                                        result_role, properties, status));
 }
 
 }  // namespace velktest

@@ -9,8 +9,8 @@
 namespace velktest {
 
 // Stands in front of a broker that tells released objects apart (a strict ledger). Notes every
-// path, instance and argument list that is made or got through it; for one thread, and one watch at
-// a time.
+// path, instance, argument list, array and enumeration that is made or got through it; for one
+// thread, and one watch at a time.
 class ReleaseWatch {
   public:
     explicit ReleaseWatch(const CMPIBroker *broker);
@@ -33,6 +33,16 @@ class ReleaseWatch {
     static CMPIInstance *get_instance(const CMPIBroker *broker, const CMPIContext *context,
                                       const CMPIObjectPath *path, const char **properties,
                                       CMPIStatus *status);
+    static CMPIArray *new_array(const CMPIBroker *broker, CMPICount count, CMPIType type,
+                                CMPIStatus *status);
+    static CMPIEnumeration *enumerate(const CMPIBroker *broker, const CMPIContext *context,
+                                      const CMPIObjectPath *path, const char **properties,
+                                      CMPIStatus *status);
+    static CMPIEnumeration *associators(const CMPIBroker *broker, const CMPIContext *context,
+                                        const CMPIObjectPath *source, const char *association,
+                                        const char *result_class, const char *role,
+                                        const char *result_role, const char **properties,
+                                        CMPIStatus *status);
 
     CMPIBrokerEncFT factory_;
     CMPIBrokerFT up_calls_;
