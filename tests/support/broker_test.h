@@ -34,14 +34,15 @@ class BrokerTest : public LibraryTest {
     // `invokeMethod zeb/cimv2:ZEB_FileTransferService.DeleteTransferredFile(FileURI="file:///a")`.
     [[nodiscard]] std::vector<std::string> up_calls();
 
+    void add_provider(const std::string &name_space, const std::string &class_name,
+                      const velkhost::broker::ManagementInterfaces &interfaces);
+
     velkhost::broker::Broker &broker() { return broker_; }
     ManagementController &controller() { return controller_; }
     UpdateJob &job() { return job_; }
     FileTransfer &transfer() { return transfer_; }
 
   private:
-    void add_provider(const std::string &name_space, const std::string &class_name,
-                      const velkhost::broker::ManagementInterfaces &interfaces);
     void add_service(DoubleBase &service);
 
     velkhost::broker::Broker broker_;
