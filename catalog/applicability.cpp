@@ -166,12 +166,17 @@ class PayloadScan {
             if (line_.tag().empty() || line_.is_payload_end()) {
                 return false;
             }
-            if (line_.is_applicability() && line_.value() == dfn_) {
+            if (line_.is_applicability() && suits(line_.value())) {
                 log_entry("found DFN\n");
                 log_entry("found dfn match\n");
                 return true;
             }
         }
+    }
+
+    // A line without a value names no adapter, not even one that has no identifier.
+    [[nodiscard]] bool suits(std::string_view value) const {
+        return !value.empty() && value == dfn_;
     }
 
     LineReader &file_;
