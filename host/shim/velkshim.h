@@ -24,6 +24,7 @@ extern "C" {
 // Puts the host's fixed paths under `folder` (copied; it must exist): /tmp/velkdebug.txt,
 // /tmp/sfcb, /tmp/networkflag, /var/tmp/filestore, /var/tmp/ZEB, /etc/cim, /etc/velkhost,
 // /usr/lib/cim and /dev/ipmi0. Every other path stays where it is. NULL ends the re-rooting.
+// dlopen finds what the root has in /usr/lib/cim by its bare name, too, before libc searches.
 // ENOENT, ENOTDIR and the like for a folder that cannot be used, EINVAL for one that itself lies
 // under a fixed path.
 VELKSHIM_API int velkshim_set_root(const char *folder);

@@ -83,6 +83,27 @@ TEST_F(ShimLibraries, BareNameIsSearchedForByTheSystem) {
     dlclose(library);
 }
 
+TEST_F(ShimLibraries, BareNameOfALibraryAmongTheHostsIsOpenedUnderTheRoot) {
+    std::filesystem::copy_file(VELKSHIM_TEST_LIBRARY, root_ / "usr/lib/cim/libbare.so");
+    void *const library = dlopen("libbare.so", RTLD_NOW);
+    ASSERT_NE(library, nullptr) << dlerror();
+    EXPECT_NE(dlsym(library, "velkshim_test_answer"), nullptr);
+    dlclose(library);
+    velkshim_set_root(nullptr);
+    EXPECT_EQ(dlopen("libbare.so", RTLD_NOW), nullptr);
+}
+
+TEST_F(ShimLibraries, FaultOfAHostsLibraryStrikesItsBareName) {
+    std::filesystem::copy_file(VELKSHIM_TEST_LIBRARY, root_ / "usr/lib/cim/libbare.so");
+    const auto refuse = [](void *, const char *step) {
+        return std::strcmp(step, "dlopen:/usr/lib/cim/libbare.so") == 0 ? ENOENT : 0;
+    };
+    velkshim_set_fault_hook(refuse, nullptr);
+    EXPECT_EQ(dlopen("libbare.so", RTLD_NOW), nullptr);
+    EXPECT_THAT(dlerror(), testing::HasSubstr("No such file or directory"));
+    velkshim_set_fault_hook(nullptr, nullptr);
+}
+
 TEST_F(ShimLibraries, NullNameIsTheProgramItself) {
     void *const program = dlopen(nullptr, RTLD_NOW);
     EXPECT_NE(program, nullptr);
