@@ -19,11 +19,11 @@ constexpr std::array kFolders = {
     "tmp/sfcb", "var/tmp/filestore", "usr/lib/cim", "etc/velkhost", "etc/cim/zeb", "dev",
 };
 
-// What the host's broker finds in /usr/lib/cim: the library, its job library, the other providers.
+// What the host's broker finds in /usr/lib/cim: the library, what it loads, the other providers.
 bool is_host_library(const fs::path &file) {
     const std::string name = file.filename().string();
     return name == "libvelkprovider.so" || name == "libconcretejob.so" ||
-           (name.starts_with("libzeb") && name.ends_with(".so"));
+           name == "libunzipfile.so" || (name.starts_with("libzeb") && name.ends_with(".so"));
 }
 
 [[noreturn]] void fail(const std::string &attempt, const fs::path &path,
