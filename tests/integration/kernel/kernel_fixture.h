@@ -6,6 +6,7 @@
 
 #include <charconv>
 #include <cstdio>
+#include <cstdlib>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -38,7 +39,8 @@ class KernelTest : public ::testing::TestWithParam<Abi> {
         }
     }
 
-    // Runs the machine; what it said is shown when the test fails.
+    // Runs the machine. What it said is shown when the test fails, and always when
+    // VELK_KERNEL_TRACE is set.
     void boot(const std::string &actions, std::vector<FaultRule> faults = {},
               Settings controller = {}) {
         outcome_ = run({GetParam(), actions, std::move(controller), std::move(faults)});
@@ -46,7 +48,7 @@ class KernelTest : public ::testing::TestWithParam<Abi> {
     }
 
     void TearDown() override {
-        if (HasFailure()) {
+        if (HasFailure() || std::getenv("VELK_KERNEL_TRACE") != nullptr) {
             std::printf("%s", outcome_.report().c_str());
         }
     }

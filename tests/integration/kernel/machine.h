@@ -46,7 +46,7 @@ struct Outcome {
 std::string why_not();
 
 // Boots, does the actions, powers off. Throws std::runtime_error when the machine does not end by
-// itself within 110 seconds.
+// itself within 200 seconds.
 Outcome run(const Setup &setup);
 
 }  // namespace velkkernel

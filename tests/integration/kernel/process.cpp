@@ -50,6 +50,7 @@ class Child {
   private:
     int start(const std::vector<std::string> &command, int out) {
         std::vector<char *> arguments;
+        arguments.reserve(command.size() + 1);
         for (const std::string &word : command) {
             arguments.push_back(const_cast<char *>(word.c_str()));
         }

@@ -1,11 +1,11 @@
 #include "tests/integration/kernel/guest/actions.h"
 
-#include "installers/adapter_session.h"
 #include "ipmi/ipmi.h"
 #include "ipmi/kcs_channel.h"
 #include "ipmi/transaction.h"
 #include "ipmi/update_session.h"
 #include "tests/integration/kernel/guest/device.h"
+#include "tests/integration/kernel/guest/install.h"
 #include "tests/integration/kernel/guest/machine_setup.h"
 #include "tests/integration/kernel/guest/pauses.h"
 #include "tests/integration/kernel/guest/text.h"
@@ -20,8 +20,6 @@
 #include <map>
 #include <string>
 #include <vector>
-
-#include <unistd.h>
 
 namespace velkguest {
 namespace {
@@ -97,23 +95,6 @@ std::string refusals() {
            ", short address " + send(kcs_fd, address);
 }
 
-void *watch(void *block) {
-    return velk::adapter::watch_session(
-        block, [](int value) { return velk::adapter::poll_session(value, "watching"); });
-}
-
-// The main thread is as busy as an installer that waits for a vendor's service. The session is
-// closed while the watcher pauses: in the middle of a query they would share the channel.
-std::string install(const Arguments &arguments) {
-    const velk::adapter::UpdateSession session(watch);
-    usleep(static_cast<useconds_t>(argument(arguments, 1, 1)) * 1'000'000U);
-    wait_for_next_pause();
-    const unsigned paused = take_paused_seconds();
-    session.close();
-    return "watched=" + std::to_string(paused) +
-           " closing=" + std::to_string(take_paused_seconds());
-}
-
 void print_log() {
     std::ifstream log(velk::kDebugLog);
     for (std::string line; std::getline(log, line);) {
@@ -138,7 +119,7 @@ std::string end() {
 
 std::string run(const Arguments &arguments) {
     using Action = std::function<std::string(const Arguments &)>;
-    static const std::map<std::string, Action, std::less<>> kActions = {
+    static const std::map<std::string, Action, std::less<>> actions = {
         {"open", [](const auto &) { return open_channel(); }},
         {"close", [](const auto &) { return disconnect_kcs(), std::string("done"); }},
         {"start", [](const auto &) { return timed(start); }},
@@ -146,7 +127,10 @@ std::string run(const Arguments &arguments) {
         {"end", [](const auto &) { return end(); }},
         {"type", [](const auto &) { return ask_type(); }},
         {"request", ask},
-        {"install", install},
+        {"install",
+         [](const auto &words) { return install(static_cast<unsigned>(argument(words, 1, 1))); }},
+        {"hurry", [](const auto &words) { return install_in_a_hurry(argument(words, 1, 10)); }},
+        {"channels", [](const auto &) { return std::to_string(open_channels()); }},
         {"send", send_raw},
         {"wait", [](const auto &words) { return wait(kcs_fd, argument(words, 1, 5000)); }},
         {"fetch", [](const auto &words) { return fetch_raw(words, true); }},
@@ -155,10 +139,11 @@ std::string run(const Arguments &arguments) {
         {"refusals", [](const auto &) { return refusals(); }},
         {"swap", [](const auto &) { return ask_at_once(true); }},
         {"apart", [](const auto &) { return ask_at_once(false); }},
+        {"closed", [](const auto &) { return close_under_a_waiter(); }},
         {"unbind", [](const auto &) { return unbind_driver(), std::string("done"); }},
     };
-    const auto found = kActions.find(arguments.front());
-    return found == kActions.end() ? "is unknown" : found->second(arguments);
+    const auto found = actions.find(arguments.front());
+    return found == actions.end() ? "is unknown" : found->second(arguments);
 }
 
 }  // namespace

@@ -38,7 +38,7 @@ void load(const std::string &module) {
 }
 
 bool device_appears() {
-    constexpr int kAttempts = 1000;
+    constexpr int kAttempts = 3000;
     for (int i = 0; i < kAttempts && access(kDevice, F_OK) != 0; ++i) {
         usleep(10'000);
     }

@@ -20,9 +20,9 @@ unsigned take_paused_seconds() {
     return paused.exchange(0);
 }
 
-void wait_for_next_pause() {
+void wait_for_pauses(unsigned count) {
     const unsigned before = begun;
-    while (begun == before) {
+    while (begun - before < count) {
         usleep(1000);
     }
 }

@@ -6,7 +6,7 @@ namespace velkguest {
 // Seconds of all calls of sleep() since the last look.
 unsigned take_paused_seconds();
 
-// Returns when another thread has just begun a pause.
-void wait_for_next_pause();
+// Returns when other threads have begun so many pauses more.
+void wait_for_pauses(unsigned count);
 
 }  // namespace velkguest

@@ -13,6 +13,7 @@ namespace {
 
 constexpr useconds_t kBothAnsweredUs = 300'000;
 constexpr unsigned short kCapacity = 272;
+constexpr int kPatienceMs = 10'000;
 
 std::string command_of(const std::string &answer) {
     const std::size_t at = answer.find("cmd=");
@@ -45,6 +46,18 @@ std::string ask_at_once(bool on_one_descriptor) {
         disconnect_ipmi(second);
     }
     return "device id got " + device_id + ", type got " + type;
+}
+
+std::string close_under_a_waiter() {
+    const int fd = connect_ipmi("/dev/ipmi0");
+    send(fd, {.id = 1, .netfn = 0x3A, .cmd = 0xC1});
+    std::thread other([fd] {
+        usleep(kBothAnsweredUs);
+        disconnect_ipmi(fd);
+    });
+    const std::string waited = wait(fd, kPatienceMs);
+    other.join();
+    return waited.substr(0, waited.find(' ')) + " " + fetch(fd, kCapacity, true);
 }
 
 }  // namespace velkguest
