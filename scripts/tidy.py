@@ -42,7 +42,7 @@ def own_sources(only):
         path = pathlib.Path(command["file"])
         inside = path.is_relative_to(ROOT) and not path.is_relative_to(ROOT / "build")
         if inside and (not only or any(word in str(path) for word in only)):
-            own[path] = command
+            own.setdefault(path, command)
     return sorted(own.values(), key=lambda c: -os.path.getsize(c["file"]))
 
 
