@@ -5,7 +5,8 @@
 
 namespace velkhost::scenario {
 
-AnswerBook::AnswerBook(std::vector<ServiceAnswer> answers) {
+AnswerBook::AnswerBook(std::vector<ServiceAnswer> answers, ServiceKind kind) {
+    usual_.return_value = usual_return_value(kind);
     for (ServiceAnswer &answer : answers) {
         auto turn = std::ranges::find(turns_, answer.match, &Turn::match);
         if (turn == turns_.end()) {
@@ -36,7 +37,7 @@ AnswerBook::Turn *AnswerBook::turn_of(std::string_view uri) {
 ServiceAnswer AnswerBook::next(std::string_view uri) {
     const std::lock_guard lock(mutex_);
     Turn *turn = turn_of(uri);
-    return turn == nullptr ? ServiceAnswer{} : turn->deal();
+    return turn == nullptr ? usual_ : turn->deal();
 }
 
 JobLooks::JobLooks(std::vector<JobLook> looks) : looks_(std::move(looks)) {}

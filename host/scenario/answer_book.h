@@ -15,10 +15,10 @@ namespace velkhost::scenario {
 // their order; the last of a turn repeats. Safe to use from any thread.
 class VELKSCENARIO_API AnswerBook {
   public:
-    explicit AnswerBook(std::vector<ServiceAnswer> answers);
+    explicit AnswerBook(std::vector<ServiceAnswer> answers, ServiceKind kind = ServiceKind::kJob);
 
     // The answer to a call that concerns `uri`: from the first turn whose match the URI contains,
-    // else from the turn without a match, else a plain success (a ServiceAnswer as it begins).
+    // else from the turn without a match, else the service's usual success.
     ServiceAnswer next(std::string_view uri);
 
   private:
@@ -34,6 +34,7 @@ class VELKSCENARIO_API AnswerBook {
 
     std::mutex mutex_;
     std::vector<Turn> turns_;
+    ServiceAnswer usual_;
 };
 
 // The looks of one job, used up one read at a time. Not safe to share between threads.

@@ -27,6 +27,12 @@ constexpr std::array kFamilies{
     Family{"job.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"zeb.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"filetransfer.", Rest::kName,    CodeKind::kCimStatus},
+    Family{"emulex_fc.",    Rest::kName,    CodeKind::kCimStatus},
+    Family{"emulex_cna.",   Rest::kName,    CodeKind::kCimStatus},
+    Family{"qlogic.",       Rest::kName,    CodeKind::kCimStatus},
+    Family{"brocade.",      Rest::kName,    CodeKind::kCimStatus},
+    Family{"broadcom.",     Rest::kName,    CodeKind::kCimStatus},
+    Family{"lsi.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"bmc.",          Rest::kName,    CodeKind::kController},
 };
 // clang-format on

@@ -2,6 +2,8 @@
 // faults that strike. Filled by the reader; the running parts (AnswerBook, FaultRules) take copies.
 #pragma once
 
+#include <array>
+#include <cstddef>
 #include <cstdint>
 #include <limits>
 #include <optional>
@@ -46,12 +48,29 @@ inline constexpr std::uint16_t kJobException = 10;
 struct JobLook {
     std::optional<std::string> job_status;  // no value: the property is null
     std::uint16_t job_state = kJobRunning;
-    std::uint32_t looks = 1;  // how many reads in a row see this
-    bool absent = false;      // the job's instance cannot be had
+    std::uint32_t looks = 1;                              // how many reads in a row see this
+    bool absent = false;                                  // the job's instance cannot be had
+    std::optional<std::uint16_t> percent = std::nullopt;  // no value: the property is null
 };
 
 // Return value of CIM_SoftwareInstallationService methods: parameters checked, job started.
 inline constexpr std::uint32_t kJobStarted = 4096;
+
+// How a service installs what it is given.
+enum class ServiceKind {
+    kJob,     // a job, whose instance clients read
+    kStatus,  // an update, whose status clients ask the service for
+    kAtOnce,  // all is over when the call returns
+};
+
+// What a service returns when all is well.
+constexpr std::uint32_t usual_return_value(ServiceKind kind) {
+    return kind == ServiceKind::kAtOnce ? 0 : kJobStarted;
+}
+
+// Statuses of an update that has no job.
+inline constexpr std::uint16_t kUpdateDone = 0;
+inline constexpr std::uint16_t kUpdateRunning = 1;
 
 // What an installation service answers to one call, and what its job reports from then on.
 struct ServiceAnswer {
@@ -63,6 +82,35 @@ struct ServiceAnswer {
     // The last look holds for ever.
     std::optional<std::vector<JobLook>> job;
 };
+
+// Families of adapters, each with a provider of its own; scenario/adapter_family.h has their names.
+enum class AdapterFamily : std::size_t {
+    kEmulexFc,
+    kEmulexCna,
+    kQlogic,
+    kBrocade,
+    kBroadcom,
+    kLsi,
+};
+inline constexpr std::size_t kAdapterFamilies = 6;
+
+// [[adapter]]: an adapter of this host, as its vendor's provider shows it. An identifier without a
+// value is one that the adapter does not tell.
+struct Adapter {
+    AdapterFamily family = AdapterFamily::kEmulexFc;
+    std::string name;                      // of the product, for people
+    std::optional<std::string> dfn;        // what payloads are matched on
+    std::optional<std::string> serial;     // serial number
+    std::string firmware;                  // version that is installed
+    std::vector<std::string> nic_ports;    // device ids of its network ports
+    std::vector<std::string> fc_ports;     // device ids of its Fibre Channel ports
+    std::optional<std::string> port_name;  // name of each port; no value: the serial number
+    bool connectors = true;                // whether its ports' connectors are shown
+    bool card = true;                      // whether the card that bears them is shown
+};
+
+// The answers of each family's service.
+using AdapterAnswers = std::array<std::vector<ServiceAnswer>, kAdapterFamilies>;
 
 // [controller]: the management controller behind the host's IPMI device.
 struct ControllerSettings {
@@ -107,6 +155,8 @@ struct Description {
     JobSettings jobs;
     ControllerSettings controller;
     std::vector<ServiceAnswer> management_controller;
+    std::vector<Adapter> adapters;
+    AdapterAnswers adapter_answers;
     FileTransferSettings file_transfer;
     std::vector<FaultRule> faults;
 };

@@ -1,8 +1,10 @@
 #include "host/scenario/reader.h"
 
+#include "host/scenario/adapter_reader.h"
 #include "host/scenario/controller_reader.h"
 #include "host/scenario/fault_steps.h"
 #include "host/scenario/read_file.h"
+#include "host/scenario/service_reader.h"
 #include "host/scenario/table_reader.h"
 
 #include <cerrno>
@@ -12,19 +14,9 @@
 namespace velkhost::scenario {
 namespace {
 
-constexpr std::uint32_t kHighestUint32 = 0xFFFFFFFF;
-constexpr std::uint32_t kHighestUint16 = 0xFFFF;
 constexpr std::uint32_t kHighestCimStatus = 200;
 constexpr std::uint32_t kHighestErrno = 4095;
-constexpr std::uint32_t kMostTurns = 1'000'000;
 constexpr std::size_t kLongestNode = 64;
-
-template <typename T, typename U>
-void assign(T &target, std::optional<U> value) {
-    if (value) {
-        target = static_cast<T>(*std::move(value));
-    }
-}
 
 HostSettings read_host(TableReader in) {
     HostSettings host;
@@ -58,60 +50,6 @@ FileTransferSettings read_file_transfer(TableReader in) {
     }
     in.finish();
     return settings;
-}
-
-JobLook read_look(TableReader in) {
-    JobLook look;
-    look.job_status = in.text("status");
-    assign(look.job_state, in.number("state", 0, kHighestUint16));
-    assign(look.looks, in.number("looks", 1, kMostTurns));
-    assign(look.absent, in.flag("absent"));
-    if (look.absent && look.job_status) {
-        in.fail("status", "cannot be seen while the job is absent");
-    }
-    in.finish();
-    return look;
-}
-
-std::optional<std::vector<JobLook>> read_job(TableReader &in) {
-    auto tables = in.tables("job");
-    if (!tables) {
-        return std::nullopt;
-    }
-    std::vector<JobLook> looks;
-    for (TableReader &table : *tables) {
-        looks.push_back(read_look(std::move(table)));
-    }
-    return looks;
-}
-
-ServiceAnswer read_answer(TableReader in) {
-    ServiceAnswer answer;
-    assign(answer.match, in.text("match"));
-    assign(answer.return_value, in.number("return_value", 0, kHighestUint32));
-    assign(answer.status, in.number("status", 0, kHighestCimStatus));
-    assign(answer.message, in.text("message"));
-    answer.job = read_job(in);
-    if (answer.status == 0 && !answer.message.empty()) {
-        in.fail("message", "needs a status other than 0 to go with");
-    }
-    const bool started = answer.status == 0 && answer.return_value == kJobStarted;
-    if (!started && answer.job) {
-        in.fail("job", "needs status 0 and return_value 4096: otherwise no job starts");
-    }
-    in.finish();
-    return answer;
-}
-
-std::vector<ServiceAnswer> read_service(TableReader in) {
-    std::vector<ServiceAnswer> answers;
-    if (auto tables = in.tables("answer")) {
-        for (TableReader &table : *tables) {
-            answers.push_back(read_answer(std::move(table)));
-        }
-    }
-    in.finish();
-    return answers;
 }
 
 int read_errno(TableReader &in) {
@@ -203,8 +141,9 @@ Description parse_description(std::string_view text, const std::string &source) 
         out.controller = read_controller(*std::move(table));
     }
     if (auto table = in.table("management_controller")) {
-        out.management_controller = read_service(*std::move(table));
+        out.management_controller = read_service(*std::move(table), ServiceKind::kJob);
     }
+    read_adapters(in, out);
     if (auto table = in.table("file_transfer")) {
         out.file_transfer = read_file_transfer(*std::move(table));
     }

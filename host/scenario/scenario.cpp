@@ -1,5 +1,6 @@
 #include "host/scenario/scenario.h"
 
+#include "host/scenario/adapter_family.h"
 #include "host/scenario/reader.h"
 
 #include <mutex>
@@ -19,8 +20,19 @@ Scenario::Scenario(Description description)
       jobs(description.jobs),
       controller(std::move(description.controller)),
       file_transfer(std::move(description.file_transfer)),
+      adapters(std::move(description.adapters)),
       management_controller(std::move(description.management_controller)),
-      faults(std::move(description.faults)) {}
+      faults(std::move(description.faults)) {
+    for (const FamilyTraits &traits : kFamilyTraits) {
+        const auto index = static_cast<std::size_t>(traits.family);
+        adapter_services_.emplace_back(std::move(description.adapter_answers.at(index)),
+                                       traits.service);
+    }
+}
+
+AnswerBook &Scenario::adapter_service(AdapterFamily family) {
+    return adapter_services_.at(static_cast<std::size_t>(family));
+}
 
 std::shared_ptr<Scenario> Scenario::current() {
     const std::lock_guard lock(current_mutex);

@@ -8,8 +8,10 @@
 #include "host/scenario/fault_rules.h"
 #include "host/scenario/model.h"
 
+#include <deque>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace velkhost::scenario {
 
@@ -34,8 +36,15 @@ class VELKSCENARIO_API Scenario {
     const JobSettings jobs;
     const ControllerSettings controller;
     const FileTransferSettings file_transfer;
+    const std::vector<Adapter> adapters;
     AnswerBook management_controller;
     FaultRules faults;
+
+    // The answers of a family's service.
+    AnswerBook &adapter_service(AdapterFamily family);
+
+  private:
+    std::deque<AnswerBook> adapter_services_;
 };
 
 }  // namespace velkhost::scenario

@@ -15,6 +15,17 @@ namespace velkhost::scenario {
 // Longest text that a key takes, in bytes.
 inline constexpr std::size_t kLongestText = 1023;
 
+// How often something can be asked to happen.
+inline constexpr std::uint32_t kMostTurns = 1'000'000;
+
+// Keeps what `target` holds by default when the key was absent.
+template <typename T, typename U>
+void assign(T &target, std::optional<U> value) {
+    if (value) {
+        target = static_cast<T>(*std::move(value));
+    }
+}
+
 class TableReader {
   public:
     // `name` is how messages call the table; `source` the file. Both and the node must outlive it.

@@ -36,7 +36,8 @@ TEST_P(ScenarioReaderErrors, NameFileLineAndReason) {
 
 constexpr const char *kSteps =
     "open:/path, unlink:/path, rmdir:/path, opendir:/path, dlopen:/path, thread.create, "
-    "broker.name, job.name, zeb.name, filetransfer.name, bmc.name";
+    "broker.name, job.name, zeb.name, filetransfer.name, emulex_fc.name, emulex_cna.name, "
+    "qlogic.name, brocade.name, broadcom.name, lsi.name, bmc.name";
 
 const std::string kNoStep =
     std::string("2: [fault] \"step\" is none that is served; served are ") + kSteps;
@@ -46,7 +47,8 @@ const std::string kMissingStep =
 // clang-format off
 INSTANTIATE_TEST_SUITE_P(Root, ScenarioReaderErrors, ::testing::Values(
     Mistake{"UnknownTable", "[hosts]",
-            "1: unknown key \"hosts\"; known are host, jobs, controller, management_controller, file_transfer, fault"},
+            "1: unknown key \"hosts\"; known are host, jobs, controller, management_controller, adapter, emulex_fc, emulex_cna, "
+            "qlogic, brocade, broadcom, lsi, file_transfer, fault"},
     Mistake{"NoTable", "host = 1", "1: [host] must be a table, not a whole number"},
     Mistake{"NoArrayOfTables", "fault = 1", "1: \"fault\" must be an array of tables, not a whole number"},
     Mistake{"TableForArray", "\n[fault]", "2: \"fault\" must be an array of tables, not a table"},
@@ -112,7 +114,8 @@ INSTANTIATE_TEST_SUITE_P(Look, ScenarioReaderErrors, ::testing::Values(
     Mistake{"NoTable", "[[management_controller.answer]]\njob = ['x']",
             "2: [management_controller.answer.job] must be a table, not a string"},
     Mistake{"UnknownKey", "[[management_controller.answer]]\njob = [\n{},\n{ text = 'x' }]",
-            "4: [management_controller.answer.job] unknown key \"text\"; known are status, state, looks, absent"},
+            "4: [management_controller.answer.job] unknown key \"text\"; known are status, state, looks, absent, "
+            "percent"},
     Mistake{"StateTooMuch", "[[management_controller.answer]]\njob = [{ state = 65536 }]",
             "2: [management_controller.answer.job] \"state\" must be from 0 to 65535, not 65536"},
     Mistake{"LooksZero", "[[management_controller.answer]]\njob = [{ looks = 0 }]",
