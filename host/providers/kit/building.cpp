@@ -30,17 +30,31 @@ CMPIDateTime *make(const Maker &maker, const DateTime &time) {
     return out;
 }
 
-CMPIArray *make(const Maker &maker, const std::vector<std::uint16_t> &numbers) {
+template <typename T, typename Set>
+CMPIArray *make_array(const Maker &maker, const std::vector<T> &values, CMPIType type, Set set) {
     CMPIStatus made{CMPI_RC_OK, nullptr};
-    CMPIArray *out =
-        CMNewArray(maker.broker, static_cast<CMPICount>(numbers.size()), CMPI_uint16, &made);
+    CMPIArray *out = CMNewArray(maker.broker, static_cast<CMPICount>(values.size()), type, &made);
     check(made, "an array");
-    for (CMPICount i = 0; i < numbers.size(); ++i) {
-        CMPIValue element{};
-        element.uint16 = numbers[i];
-        check(CMSetArrayElementAt(out, i, &element, CMPI_uint16), "an array's element");
+    for (CMPICount i = 0; i < values.size(); ++i) {
+        check(set(out, i, values[i]), "an array's element");
     }
     return out;
+}
+
+CMPIArray *make(const Maker &maker, const std::vector<std::uint16_t> &numbers) {
+    return make_array(maker, numbers, CMPI_uint16,
+                      [](CMPIArray *array, CMPICount i, std::uint16_t number) {
+                          CMPIValue element{};
+                          element.uint16 = number;
+                          return CMSetArrayElementAt(array, i, &element, CMPI_uint16);
+                      });
+}
+
+CMPIArray *make(const Maker &maker, const std::vector<std::string> &texts) {
+    return make_array(maker, texts, CMPI_string,
+                      [](CMPIArray *array, CMPICount i, const Text &text) {
+                          return CMSetArrayElementAt(array, i, chars(text), CMPI_chars);
+                      });
 }
 
 // Hands `value` to `sink(const CMPIValue *, CMPIType)` in the form that its type asks for.
@@ -61,6 +75,9 @@ CMPIStatus pass(const Maker &maker, const Value &value, Sink sink) {
             } else if constexpr (std::is_same_v<Held, std::vector<std::uint16_t>>) {
                 out.array = make(maker, held);
                 return sink(&out, CMPI_uint16A);
+            } else if constexpr (std::is_same_v<Held, std::vector<std::string>>) {
+                out.array = make(maker, held);
+                return sink(&out, CMPI_stringA);
             } else if constexpr (std::is_same_v<Held, bool>) {
                 out.boolean = static_cast<CMPIBoolean>(held);
                 return sink(&out, CMPI_boolean);

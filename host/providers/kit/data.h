@@ -24,10 +24,12 @@ struct DateTime {
     bool is_interval = false;
 };
 
-// A text that may be null, a number of its CIM type, a reference, a time, or a list of numbers.
+// A text that may be null, a number of its CIM type, a reference, a time, or a list of numbers or
+// texts.
 using Text = std::optional<std::string>;
-using Value = std::variant<Text, bool, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t,
-                           Reference, DateTime, std::vector<std::uint16_t>>;
+using Value =
+    std::variant<Text, bool, std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t, Reference,
+                 DateTime, std::vector<std::uint16_t>, std::vector<std::string>>;
 
 struct Property {
     std::string name;
@@ -37,6 +39,14 @@ struct Property {
 struct Instance {
     std::vector<Property> keys;
     std::vector<Property> properties;  // without the keys
+};
+
+// An instance with its class.
+struct Element {
+    std::string class_name;
+    Instance instance;
+
+    [[nodiscard]] Reference reference() const { return {class_name, instance.keys}; }
 };
 
 // What a method answers when its CIM status is success.

@@ -1,60 +1,11 @@
 #include "host/providers/kit/export.h"
 
-#include "host/providers/kit/building.h"
-#include "host/providers/kit/cim_error.h"
+#include "host/providers/kit/provider_call.h"
 
 #include <cmpi/cmpimacs.h>
 
 namespace velkhost::providers {
 namespace {
-
-constexpr CMPIStatus kSuccess{CMPI_RC_OK, nullptr};
-constexpr int kTableVersion = 200;
-
-// The table declares the handle of an instance provider const; what is behind it is not.
-Binding &binding_of(const void *hdl) {
-    return *static_cast<Binding *>(const_cast<void *>(hdl));
-}
-
-// The status for the exception in flight.
-CMPIStatus status_of_exception(const Maker &maker) {
-    try {
-        throw;
-    } catch (const CimError &error) {
-        return maker.status(error.code(), error.what());
-    } catch (const std::exception &error) {
-        return maker.status(CMPI_RC_ERR_FAILED, error.what());
-    } catch (...) {
-        return maker.status(CMPI_RC_ERR_FAILED, "Unknown failure in a provider");
-    }
-}
-
-// Runs one provider call; nothing is thrown across the interface.
-template <typename Mi, typename Call>
-CMPIStatus run(const Mi *mi, const CMPIObjectPath *path, Call call) noexcept {
-    const Binding &binding = binding_of(mi->hdl);
-    Maker maker{binding.broker, {}};
-    try {
-        if (!binding.provider) {
-            throw CimError(CMPI_RC_ERR_FAILED, "The provider has been cleaned up");
-        }
-        maker.name_space = Path(path).name_space();
-        call(*binding.provider, maker);
-        return kSuccess;
-    } catch (...) {
-        return status_of_exception(maker);
-    }
-}
-
-template <typename Mi>
-CMPIStatus clean_up(Mi *mi, const CMPIContext * /*context*/, CMPIBoolean terminating) {
-    Binding &binding = binding_of(mi->hdl);
-    if (terminating == 0 && binding.provider && !binding.provider->may_unload()) {
-        return {CMPI_RC_NEVER_UNLOAD, nullptr};
-    }
-    binding.provider.reset();
-    return kSuccess;
-}
 
 CMPIStatus enumerate_names(CMPIInstanceMI *mi, const CMPIContext * /*context*/,
                            const CMPIResult *result, const CMPIObjectPath *path) {
@@ -119,6 +70,18 @@ CMPIStatus not_supported(CMPIInstanceMI *mi, const CMPIContext * /*context*/,
 }
 
 }  // namespace
+
+CMPIStatus status_of_exception(const Maker &maker) {
+    try {
+        throw;
+    } catch (const CimError &error) {
+        return maker.status(error.code(), error.what());
+    } catch (const std::exception &error) {
+        return maker.status(CMPI_RC_ERR_FAILED, error.what());
+    } catch (...) {
+        return maker.status(CMPI_RC_ERR_FAILED, "Unknown failure in a provider");
+    }
+}
 
 CMPIInstanceMIFT instance_table(const char *name) {
     CMPIInstanceMIFT table{};

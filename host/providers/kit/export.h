@@ -26,7 +26,7 @@ CMPIMethodMIFT method_table(const char *name);
 void report_made(CMPIStatus *status);
 void report_exception(const CMPIBroker *broker, CMPIStatus *status);
 
-// The body of a factory. `Mi` is CMPIInstanceMI or CMPIMethodMI, `table` its function table.
+// The body of a factory. `Mi` is the kind of provider object, `table` its function table.
 template <typename Class, typename Mi, typename Table>
 Mi *make_mi(const CMPIBroker *broker, CMPIStatus *status, Table &table) {
     static Binding binding;
@@ -47,16 +47,14 @@ Mi *make_mi(const CMPIBroker *broker, CMPIStatus *status, Table &table) {
 // Exports `Class` (derived from Provider) as the provider `NAME`, for instances and methods.
 // A macro because a factory's symbol is made from the provider's name.
 // NOLINTBEGIN(cppcoreguidelines-macro-usage,bugprone-macro-parentheses)
-#define VELKHOST_EXPORT_PROVIDER(NAME, Class)                                                  \
-    extern "C" [[gnu::visibility("default")]] CMPIInstanceMI *NAME##_Create_InstanceMI(        \
-        const CMPIBroker *broker, const CMPIContext * /*context*/, CMPIStatus *status) {       \
-        static CMPIInstanceMIFT table = velkhost::providers::instance_table("instance" #NAME); \
-        return velkhost::providers::make_mi<Class, CMPIInstanceMI>(broker, status, table);     \
-    }                                                                                          \
-    extern "C" [[gnu::visibility("default")]] CMPIMethodMI *NAME##_Create_MethodMI(            \
-        const CMPIBroker *broker, const CMPIContext * /*context*/, CMPIStatus *status) {       \
-        static CMPIMethodMIFT table = velkhost::providers::method_table("method" #NAME);       \
-        return velkhost::providers::make_mi<Class, CMPIMethodMI>(broker, status, table);       \
-    }                                                                                          \
+#define VELKHOST_EXPORT_FACTORY(NAME, Class, KIND, kind)                                   \
+    extern "C" [[gnu::visibility("default")]] CMPI##KIND##MI *NAME##_Create_##KIND##MI(    \
+        const CMPIBroker *broker, const CMPIContext * /*context*/, CMPIStatus *status) {   \
+        static CMPI##KIND##MIFT table = velkhost::providers::kind##_table(#kind #NAME);    \
+        return velkhost::providers::make_mi<Class, CMPI##KIND##MI>(broker, status, table); \
+    }                                                                                      \
     static_assert(true, "takes the semicolon")
+#define VELKHOST_EXPORT_PROVIDER(NAME, Class)                 \
+    VELKHOST_EXPORT_FACTORY(NAME, Class, Instance, instance); \
+    VELKHOST_EXPORT_FACTORY(NAME, Class, Method, method)
 // NOLINTEND(cppcoreguidelines-macro-usage,bugprone-macro-parentheses)

@@ -55,11 +55,35 @@ std::size_t Path::key_count() const {
     return path_ == nullptr ? 0 : CMGetKeyCount(path_, nullptr);
 }
 
+std::string Path::class_name() const {
+    if (path_ == nullptr) {
+        return {};
+    }
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return text_of(CMGetClassName(path_, &status)).value_or("");
+}
+
+Path Path::reference_key(const char *name) const {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    const CMPIData data = CMGetKey(path_, name, &status);
+    return Path(is_usable(status, data) && data.type == CMPI_ref ? data.value.ref : nullptr);
+}
+
+bool Path::has(const Property &wanted) const {
+    if (const auto *reference = std::get_if<Reference>(&wanted.value)) {
+        return reference_key(wanted.name.c_str()).names(*reference);
+    }
+    const Text *text = std::get_if<Text>(&wanted.value);
+    return text != nullptr && *text && key(wanted.name.c_str()) == *text;
+}
+
 bool Path::has_exactly(const std::vector<Property> &keys) const {
-    return key_count() == keys.size() && std::ranges::all_of(keys, [this](const Property &wanted) {
-               const Text *text = std::get_if<Text>(&wanted.value);
-               return text != nullptr && *text && key(wanted.name.c_str()) == *text;
-           });
+    return key_count() == keys.size() &&
+           std::ranges::all_of(keys, [this](const Property &wanted) { return has(wanted); });
+}
+
+bool Path::names(const Reference &instance) const {
+    return same_name(class_name(), instance.class_name) && has_exactly(instance.keys);
 }
 
 CMPIData Args::typed(const char *name, CMPIType type, const char *type_name) const {
@@ -90,6 +114,24 @@ std::string Args::text(const char *name) const {
 
 std::uint8_t Args::uint8(const char *name) const {
     return typed(name, CMPI_uint8, "uint8").value.uint8;
+}
+
+std::vector<std::uint16_t> Args::uint16s(const char *name) const {
+    const CMPIArray *array = typed(name, CMPI_uint16A, "uint16[]").value.array;
+    std::vector<std::uint16_t> numbers;
+    const CMPICount count = CMGetArrayCount(array, nullptr);
+    for (CMPICount i = 0; i < count; ++i) {
+        CMPIStatus status{CMPI_RC_OK, nullptr};
+        const CMPIData element = CMGetArrayElementAt(array, i, &status);
+        if (is_usable(status, element)) {
+            numbers.push_back(element.value.uint16);
+        }
+    }
+    return numbers;
+}
+
+Path Args::reference(const char *name) const {
+    return Path(typed(name, CMPI_ref, "reference").value.ref);
 }
 
 }  // namespace velkhost::providers

@@ -25,13 +25,20 @@ class Path {
     explicit Path(const CMPIObjectPath *path) : path_(path) {}
 
     [[nodiscard]] std::string name_space() const;
+    [[nodiscard]] std::string class_name() const;
+    [[nodiscard]] const CMPIObjectPath *get() const { return path_; }
     // The text of a key; no value when it is absent, null or no string.
     [[nodiscard]] std::optional<std::string> key(const char *name) const;
     [[nodiscard]] std::size_t key_count() const;
-    // Whether the path has these keys and no others. All keys are texts.
+    // Whether the path has these keys and no others. All keys are texts or references.
     [[nodiscard]] bool has_exactly(const std::vector<Property> &keys) const;
+    // Whether the path is that of the instance, in whatever namespace.
+    [[nodiscard]] bool names(const Reference &instance) const;
 
   private:
+    [[nodiscard]] bool has(const Property &wanted) const;
+    [[nodiscard]] Path reference_key(const char *name) const;
+
     const CMPIObjectPath *path_;
 };
 
@@ -43,6 +50,8 @@ class Args {
     // Throw CimError "invalid parameter" when the argument is absent, null or of another type.
     [[nodiscard]] std::string text(const char *name) const;
     [[nodiscard]] std::uint8_t uint8(const char *name) const;
+    [[nodiscard]] std::vector<std::uint16_t> uint16s(const char *name) const;
+    [[nodiscard]] Path reference(const char *name) const;
 
   private:
     [[nodiscard]] CMPIData typed(const char *name, CMPIType type, const char *type_name) const;

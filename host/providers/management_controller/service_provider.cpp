@@ -1,31 +1,24 @@
 // ZEB_SoftwareInstallationService: installs system firmware through the management controller.
 #include "host/providers/kit/cim_error.h"
 #include "host/providers/kit/export.h"
-#include "host/providers/kit/local_file.h"
+#include "host/providers/kit/installation_service.h"
+#include "host/providers/kit/naming.h"
 #include "host/providers/kit/shared_while_used.h"
 #include "host/providers/kit/step_fault.h"
 #include "host/providers/management_controller/controller_texts.h"
-#include "host/providers/management_controller/job_table.h"
 #include "host/scenario/scenario.h"
-
-#include <utility>
 
 namespace velkhost::providers {
 namespace {
 
 using scenario::Scenario;
-using scenario::ServiceAnswer;
 
-// Return value of CIM_SoftwareInstallationService methods: the URI cannot be reached.
-constexpr std::uint32_t kUriNotAccessible = 4107;
-
-// The service's name is spelled so by the controller.
-std::vector<Property> service_keys() {
-    return {{"SystemCreationClassName", Text("ZEB_ManagementController")},
-            {"SystemName", Text("ManagementController")},
-            {"CreationClassName", Text("ZEB_SoftwareInstallationService")},
-            {"Name", Text("RXCSoftwareInstallatiIonService")}};
-}
+// What a caller asks for.
+struct UpdateRequest {
+    std::string uri;
+    std::uint8_t update_operation = 0;  // 0 primary bank, 1 backup bank
+    std::uint8_t reboot_option = 0;     // 1: the controller restarts after the update
+};
 
 std::uint8_t switch_argument(const Args &in, const char *name) {
     const std::uint8_t value = in.uint8(name);
@@ -42,72 +35,42 @@ UpdateRequest read_request(const Args &in) {
             switch_argument(in, "reboot_option")};
 }
 
-bool is_accessible(const std::string &uri) {
-    const auto path = path_of_file_uri(uri);
-    return path && is_readable_file(*path);
+NewJob make_job(const UpdateRequest &request) {
+    return {"ZEB_SoftwareInstallationJob",
+            {request.uri,
+             {{"Update_Operation", request.update_operation},
+              {"reboot_option", request.reboot_option}}},
+            usual_job(request.uri, request.reboot_option == 1)};
 }
 
-class SoftwareInstallationService final : public Provider {
+class SoftwareInstallationService final : public InstallationService {
   public:
-    SoftwareInstallationService() { Scenario::current(); }  // fails while it is unusable
+    SoftwareInstallationService()
+        : InstallationService("ZEB_SoftwareInstallationService",
+                              "Management controller firmware update") {}
 
-    [[nodiscard]] const char *class_name() const override {
-        return "ZEB_SoftwareInstallationService";
-    }
-
-    std::vector<Instance> instances() override;
-    MethodResult invoke(const Path &target, const std::string &method, const Args &in) override;
-    // The controller's jobs would be forgotten.
-    [[nodiscard]] bool may_unload() const override { return false; }
+  protected:
+    [[nodiscard]] std::vector<Property> keys() const override;
+    MethodResult install(const Args &in) override;
 
   private:
-    MethodResult install(const UpdateRequest &request);
-    MethodResult answer_as(ServiceAnswer answer, const UpdateRequest &request);
-
     std::shared_ptr<JobTable> jobs_ = shared_while_used<JobTable>();
 };
 
-std::vector<Instance> SoftwareInstallationService::instances() {
-    return {{service_keys(), {{"ElementName", Text("Management controller firmware update")}}}};
+// The service's name is spelled so by the controller.
+std::vector<Property> SoftwareInstallationService::keys() const {
+    return service_keys("ZEB_ManagementController", "ManagementController", class_name(),
+                        "RXCSoftwareInstallatiIonService");
 }
 
-MethodResult SoftwareInstallationService::invoke(const Path &target, const std::string &method,
-                                                 const Args &in) {
-    if (!same_name(method, "InstallFromURI")) {
-        fail_no_method(method);
-    }
-    if (!target.has_exactly(service_keys())) {
-        fail_not_found();
-    }
-    return install(read_request(in));
-}
-
-MethodResult SoftwareInstallationService::install(const UpdateRequest &request) {
+MethodResult SoftwareInstallationService::install(const Args &in) {
+    const UpdateRequest request = read_request(in);
     pass_step("zeb.install", request.uri);
     if (!is_accessible(request.uri)) {
         return {kUriNotAccessible, {}};
     }
-    return answer_as(Scenario::current()->management_controller.next(request.uri), request);
-}
-
-MethodResult SoftwareInstallationService::answer_as(ServiceAnswer answer,
-                                                    const UpdateRequest &request) {
-    if (answer.status != CMPI_RC_OK) {
-        throw CimError(static_cast<CMPIrc>(answer.status), answer.message);
-    }
-    MethodResult result{answer.return_value, {}};
-    if (answer.return_value != scenario::kJobStarted) {
-        return result;
-    }
-    if (!answer.job) {
-        answer.job = usual_job(request.uri, request.reboot_option == 1);
-    }
-    if (!answer.job->empty()) {
-        const std::string id = jobs_->start(request, *std::move(answer.job));
-        result.outputs.push_back(
-            {"Job", Reference{"ZEB_SoftwareInstallationJob", {{"InstanceID", id}}}});
-    }
-    return result;
+    return job_result(Scenario::current()->management_controller.next(request.uri), *jobs_,
+                      make_job(request));
 }
 
 }  // namespace

@@ -87,6 +87,11 @@ class MofProject : public ::testing::Test {
   protected:
     NamespaceUnit velk_ = compiled("velk_cimv2.mof");
     NamespaceUnit zeb_ = compiled("zeb_cimv2.mof");
+    NamespaceUnit emulex_ = compiled("root_emulex.mof");
+    NamespaceUnit qlogic_ = compiled("qlogic_cimv2.mof");
+    NamespaceUnit brocade_ = compiled("root_brocade.mof");
+    NamespaceUnit broadcom_ = compiled("brcmfwup_cimv2.mof");
+    NamespaceUnit lsi_ = compiled("tavu_cimv2.mof");
     const Texts service_keys_{"SystemCreationClassName", "SystemName", "CreationClassName", "Name"};
 };
 
@@ -106,6 +111,14 @@ TEST_F(MofProject, ServicesHaveTheFourKeysOfAService) {
     EXPECT_EQ(keys_of(velk_, "PAKRO_VMpkgInstallationService"), service_keys_);
     EXPECT_EQ(keys_of(zeb_, "ZEB_SoftwareInstallationService"), service_keys_);
     EXPECT_EQ(keys_of(zeb_, "ZEB_FileTransferService"), service_keys_);
+    for (const auto &[unit, name] : {std::pair{&emulex_, "ELXHBA_SoftwareInstallationService"},
+                                     std::pair{&emulex_, "ELXUCNA_SoftwareInstallationService"},
+                                     std::pair{&qlogic_, "QLogic_NIC_SoftwareInstallationService"},
+                                     std::pair{&brocade_, "BROCADE_HBASoftwareInstallationService"},
+                                     std::pair{&broadcom_, "BRCMFWUP_SoftwareInstallationService"},
+                                     std::pair{&lsi_, "TAVU_SoftwareInstallationService"}}) {
+        EXPECT_EQ(keys_of(*unit, name), service_keys_) << name;
+    }
     EXPECT_EQ(find_class(velk_, "PAKRO_VMpkgInstallationService").superclass,
               "CIM_SoftwareInstallationService");
 }
@@ -174,12 +187,63 @@ TEST_F(MofProject, TransferServiceHasItsMethods) {
                             "uint32 DeleteTransferredFile(in string FileURI)"));
 }
 
+TEST_F(MofProject, AdapterVendorsHaveTheirNamespaces) {
+    EXPECT_EQ(emulex_.name_space, "root/emulex");
+    EXPECT_EQ(qlogic_.name_space, "qlogic/cimv2");
+    EXPECT_EQ(brocade_.name_space, "root/brocade");
+    EXPECT_EQ(broadcom_.name_space, "brcmfwup/cimv2");
+    EXPECT_EQ(lsi_.name_space, "tavu/cimv2");
+}
+
+TEST_F(MofProject, AdapterPartsHaveTheirKeys) {
+    const Texts device_keys{"SystemCreationClassName", "SystemName", "CreationClassName",
+                            "DeviceID"};
+    EXPECT_EQ(keys_of(emulex_, "ELXHBA_FCPort"), device_keys);
+    EXPECT_EQ(keys_of(emulex_, "ELXUCNA_EthernetPort"), device_keys);
+    EXPECT_EQ(keys_of(qlogic_, "QLogic_NIC_PortController"), device_keys);
+    EXPECT_EQ(keys_of(qlogic_, "QLogic_FCHBA_PortController"), device_keys);
+    EXPECT_EQ(keys_of(brocade_, "BROCADE_PortController"), device_keys);
+    EXPECT_THAT(keys_of(emulex_, "ELXUCNA_Card"), ElementsAre("Tag", "CreationClassName"));
+    EXPECT_THAT(keys_of(emulex_, "ELXHBA_VitalProductData"), ElementsAre("InstanceID"));
+    EXPECT_THAT(keys_of(emulex_, "ELXUCNA_Realizes"), ElementsAre("Antecedent", "Dependent"));
+    EXPECT_THAT(keys_of(emulex_, "ELXUCNA_Container"),
+                ElementsAre("GroupComponent", "PartComponent"));
+    EXPECT_THAT(keys_of(qlogic_, "QLogic_NIC_PhysicalPackagePortController"),
+                ElementsAre("Antecedent", "Dependent"));
+    EXPECT_THAT(keys_of(qlogic_, "QLogic_SoftwareInstallationJob"), ElementsAre("InstanceID"));
+}
+
+TEST_F(MofProject, AdapterServicesHaveTheirMethods) {
+    EXPECT_THAT(methods_of(emulex_, "ELXHBA_SoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in ELXHBA_FCPort REF Target, in string URI)"));
+    EXPECT_THAT(
+        methods_of(emulex_, "ELXUCNA_SoftwareInstallationService"),
+        ElementsAre("uint32 InstallFromURI(in ELXUCNA_EthernetPort REF Target, in string URI)"));
+    EXPECT_THAT(methods_of(brocade_, "BROCADE_HBASoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in uint16[] InstallOptions, "
+                            "in BROCADE_PortController REF Target, in string URI)"));
+    EXPECT_THAT(methods_of(qlogic_, "QLogic_NIC_SoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in uint16[] InstallOptions, "
+                            "in QLogic_NIC_PortController REF Target, in string URI, "
+                            "out QLogic_SoftwareInstallationJob REF Job)"));
+    EXPECT_THAT(methods_of(qlogic_, "QLogic_FCHBA_SoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in uint16[] InstallOptions, "
+                            "in QLogic_FCHBA_PortController REF Target, in string URI, "
+                            "out QLogic_SoftwareInstallationJob REF Job)"));
+    EXPECT_THAT(methods_of(broadcom_, "BRCMFWUP_SoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in string URI, in string FacadeOption)",
+                            "uint32 CheckStatus(in string ID, out uint32 status)"));
+    EXPECT_THAT(methods_of(lsi_, "TAVU_SoftwareInstallationService"),
+                ElementsAre("uint32 InstallFromURI(in string URI)"));
+}
+
 TEST_F(MofProject, EveryQualifierInUseIsDeclared) {
     const auto declared = [](const NamespaceUnit &unit, const cim::Qualifier &used) {
         return std::any_of(unit.qualifiers.begin(), unit.qualifiers.end(),
                            [&used](const QualifierDecl &each) { return each.name == used.name; });
     };
-    for (const NamespaceUnit *unit : {&velk_, &zeb_}) {
+    for (const NamespaceUnit *unit :
+         {&velk_, &zeb_, &emulex_, &qlogic_, &brocade_, &broadcom_, &lsi_}) {
         for (const cim::ClassDecl &each : unit->classes) {
             for (const cim::PropertyDecl &property : each.properties) {
                 for (const cim::Qualifier &used : property.qualifiers) {

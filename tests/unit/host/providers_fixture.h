@@ -31,14 +31,23 @@ class ProviderTest : public ::testing::Test {
     ProviderTest() {
         std::string name = (std::filesystem::temp_directory_path() / "velk-XXXXXX").string();
         folder_ = ::mkdtemp(name.data());
-        const mof::CompileResult compiled = mof::compile_file(VELK_MOF_DIR "/zeb_cimv2.mof");
+        for (const auto &file : std::filesystem::directory_iterator(VELK_MOF_DIR)) {
+            if (file.path().extension() == ".mof" &&
+                !file.path().filename().string().starts_with("cim_")) {
+                add_classes(file.path());
+            }
+        }
+        EXPECT_EQ(broker_.register_providers(VELK_REGISTRATION), "");
+    }
+
+    void add_classes(const std::filesystem::path &file) {
+        const mof::CompileResult compiled = mof::compile_file(file);
         EXPECT_TRUE(compiled.ok()) << compiled.error_text();
         for (const mof::NamespaceUnit &unit : compiled.units) {
             for (const cim::ClassDecl &declared : unit.classes) {
                 EXPECT_EQ(broker_.repository().add_class(unit.name_space, declared), "");
             }
         }
-        EXPECT_EQ(broker_.register_providers(VELK_REGISTRATION), "");
     }
 
     // The scenario of the test, as the text of its file.

@@ -1,13 +1,26 @@
-#include "host/providers/management_controller/job_table.h"
+#include "host/providers/kit/job_table.h"
 
 #include <algorithm>
 #include <utility>
 
 namespace velkhost::providers {
+namespace {
 
-std::string JobTable::start(UpdateRequest request, std::vector<scenario::JobLook> looks) {
+// The organisation comes first and is set off by a colon (InstanceID, DSP1103): the class
+// ZEB_SoftwareInstallationJob has jobs "ZEB:SoftwareInstallationJob:1" and so on.
+std::string id_of(std::string job_class, std::uint32_t number) {
+    if (const auto mark = job_class.find('_'); mark != std::string::npos) {
+        job_class[mark] = ':';
+    }
+    return job_class + ':' + std::to_string(number);
+}
+
+}  // namespace
+
+std::string JobTable::start(const std::string &job_class, JobRequest request,
+                            std::vector<scenario::JobLook> looks) {
     const std::lock_guard lock(mutex_);
-    std::string id = "ZEB:SoftwareInstallationJob:" + std::to_string(++started_);
+    std::string id = id_of(job_class, ++started_);
     jobs_.push_back({id, std::move(request), scenario::JobLooks(std::move(looks))});
     if (jobs_.size() > kMostJobs) {
         jobs_.pop_front();
@@ -15,7 +28,7 @@ std::string JobTable::start(UpdateRequest request, std::vector<scenario::JobLook
     return id;
 }
 
-std::optional<UpdateRequest> JobTable::request_of(const std::string &id) const {
+std::optional<JobRequest> JobTable::request_of(const std::string &id) const {
     const std::lock_guard lock(mutex_);
     const auto job = std::ranges::find(jobs_, id, &Job::id);
     return job == jobs_.end() ? std::nullopt : std::optional(job->request);

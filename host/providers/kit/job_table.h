@@ -1,6 +1,7 @@
-// The update jobs that the management controller has started.
+// The jobs that a provider's services have started.
 #pragma once
 
+#include "host/providers/kit/data.h"
 #include "host/scenario/answer_book.h"
 
 #include <cstdint>
@@ -12,17 +13,16 @@
 
 namespace velkhost::providers {
 
-// What a caller asked for.
-struct UpdateRequest {
+// What a job was started for.
+struct JobRequest {
     std::string uri;
-    std::uint8_t update_operation = 0;  // 0 primary bank, 1 backup bank
-    std::uint8_t reboot_option = 0;     // 1: the controller restarts after the update
+    std::vector<Property> shown;  // what the job's instance tells of it
 };
 
 // A job as one look at it finds it.
 struct JobView {
     std::string id;
-    UpdateRequest request;
+    JobRequest request;
     scenario::JobLook look;
 };
 
@@ -31,11 +31,12 @@ class JobTable {
   public:
     static constexpr std::size_t kMostJobs = 256;
 
-    // Starts a job that shows `looks` (not empty); its id.
-    std::string start(UpdateRequest request, std::vector<scenario::JobLook> looks);
+    // Starts a job of the class that shows `looks` (not empty); its id.
+    std::string start(const std::string &job_class, JobRequest request,
+                      std::vector<scenario::JobLook> looks);
 
     // What was asked of the job; no value when there is no such job.
-    std::optional<UpdateRequest> request_of(const std::string &id) const;
+    std::optional<JobRequest> request_of(const std::string &id) const;
     // One read of the job, which uses up one look.
     std::optional<JobView> take_look(const std::string &id);
     // All jobs as their next read will find them; uses up nothing.
@@ -44,7 +45,7 @@ class JobTable {
   private:
     struct Job {
         std::string id;
-        UpdateRequest request;
+        JobRequest request;
         scenario::JobLooks looks;
     };
 
