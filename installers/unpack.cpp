@@ -31,12 +31,12 @@ Minizip find_minizip() {
 int unpack_package(const char *local_uri) {
     log_format("tmpDestinationPath = %s\n", local_uri);
     const char *slash = std::strchr(local_uri, '/');
-    if (slash == nullptr || slash[1] == '\0') {
+    if (slash == nullptr) {
         return kUnpackFailed;
     }
     const char *path = slash + 1;
     log_format("Effective path: %s\n", path);
-    const Minizip unzip = find_minizip();
+    const Minizip unzip = *path == '\0' ? nullptr : find_minizip();
     return unzip == nullptr ? kUnpackFailed : unzip(path, kUnpackDirectory);
 }
 
