@@ -7,3 +7,15 @@ velk_add_tests(library_applicability_tests LABEL unit.library
     applicability_scanners_test.cpp
     applicability_table_test.cpp
   LIBS velk_test_support ${VELK_UNITS})
+
+if(TARGET velkbmc_device)
+  velk_add_tests(library_adapter_tests LABEL unit.library
+    SOURCES
+      adapter_families.cpp
+      adapter_fixture.cpp
+      adapter_frame_test.cpp
+      adapter_status_test.cpp
+      controller_stand.cpp
+      unpack_test.cpp
+    LIBS velk_broker_test_support velk_unzip_double velkbmc_device ${VELK_UNITS})
+endif()
