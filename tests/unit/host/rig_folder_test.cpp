@@ -83,8 +83,9 @@ TEST(RigRunFolder, PlaceThatIsAFileIsRefusedByName) {
 
 TEST(RigRunFolder, FurnishedOneHasFoldersScenarioAndLinksToTheHostsLibraries) {
     const Place place;
-    for (const char *name : {"libvelkprovider.so", "libconcretejob.so", "libunzipfile.so",
-                             "libzebfiletransfer.so", "libvelkbroker.so", "libzeb.txt"}) {
+    for (const char *name :
+         {"libvelkprovider.so", "libconcretejob.so", "libunzipfile.so", "libzebfiletransfer.so",
+          "libadapterlsi.so", "libvelkbroker.so", "libzeb.txt"}) {
         make_file(place / "lib" / name);
     }
     const RunFolder folder = RunFolder::at(place / "root");
@@ -97,6 +98,7 @@ TEST(RigRunFolder, FurnishedOneHasFoldersScenarioAndLinksToTheHostsLibraries) {
               place / "lib/libconcretejob.so");
     EXPECT_TRUE(fs::exists(folder.inside("/usr/lib/cim/libzebfiletransfer.so")));
     EXPECT_TRUE(fs::exists(folder.inside("/usr/lib/cim/libunzipfile.so")));
+    EXPECT_TRUE(fs::exists(folder.inside("/usr/lib/cim/libadapterlsi.so")));
     EXPECT_FALSE(fs::exists(folder.inside("/usr/lib/cim/libvelkbroker.so")));
     EXPECT_FALSE(fs::exists(folder.inside("/usr/lib/cim/libzeb.txt")));
 }
