@@ -1,14 +1,19 @@
 #!/usr/bin/env bash
 # Makes the example packages in a folder: copies each descriptor of examples/packages and makes the
-# payload that it names, with the size that it states. What comes out is the same on every machine
-# and at every run; a payload that is already as it should be is left alone.
+# payload that it names. What comes out is the same on every machine and at every run; a payload
+# that is already as it should be is left alone.
 #
-#   examples/make_packages.sh FOLDER
+#   examples/make_packages.sh FOLDER [PACKAGE...]     PACKAGE: a name without .xml; none: all
 #
-# Needs bash and the core utilities. Ends with 0, or with 1 and a message.
+# Needs bash, gzip and the core utilities. Ends with 0, or with 1 and a message.
 set -euo pipefail
 
-source_folder=$(cd -- "$(dirname -- "${BASH_SOURCE[0]}")" && pwd)/packages
+examples=$(cd -- "$(dirname -- "${BASH_SOURCE[0]}")" && pwd)
+source_folder=$examples/packages
+# shellcheck source=examples/zip_writer.sh
+source "$examples/zip_writer.sh"
+
+readonly adapter_image_size=16384
 
 fail() {
   printf 'make_packages.sh: %s\n' "$1" >&2
@@ -49,19 +54,34 @@ image() {
   noise "0x0${sum:0:15}1" $(($3 - 128)) | basenc --base16 -d
 }
 
+# adapter_archive CONFIGURATION VERSION: a zip archive of the payload configuration file and the
+# images that it names. Its text is deflated; images, which nothing makes smaller, are stored.
+adapter_archive() {
+  local name file=$scratch/image.new
+  zip_begin
+  zip_file image/payload.xml "$1" 8
+  while IFS= read -r name; do
+    image "${name##*/}" "$2" "$adapter_image_size" > "$file"
+    zip_file "$name" "$file" 0
+  done < <(sed -n 's/.*<payload[^>]*>\([^<]*\)<.*/\1/p' "$1")
+  zip_end
+}
+
 checksum() {
   local sum
   sum=$(sha256sum -- "$1")
   printf '%s' "${sum%% *}"
 }
 
-# payload FILE CODE VERSION SIZE [CHECKSUM]
+# payload FILE CHECKSUM COMMAND...: makes the file from what the command writes, unless it is there
+# with that checksum; an empty one fits every file.
 payload() {
-  local file=$1 wanted=${5:-}
+  local file=$1 wanted=$2
+  shift 2
   if [[ -n $wanted && -f $file && $(checksum "$file") == "$wanted" ]]; then
     return
   fi
-  image "$2" "$3" "$4" > "$file.new"
+  "$@" > "$file.new"
   if [[ -n $wanted && $(checksum "$file.new") != "$wanted" ]]; then
     rm -f -- "$file.new"
     fail "${file##*/} came out with another checksum than its descriptor states"
@@ -69,23 +89,44 @@ payload() {
   mv -f -- "$file.new" "$file"
 }
 
+# package NAME FOLDER
 package() {
-  local descriptor=$1 folder=$2
-  payload "$folder/$(property "$descriptor" payload)" \
-    "$(property "$descriptor" identificationCode)" "$(property "$descriptor" version)" \
-    "$(property "$descriptor" payloadSize)" "$(property "$descriptor" payloadChecksum)"
+  local descriptor=$source_folder/$1.xml folder=$2 file version sum
+  [[ -f $descriptor ]] || fail "there is no package $1"
+  file=$(property "$descriptor" payload)
+  version=$(property "$descriptor" version)
+  sum=$(property "$descriptor" payloadChecksum)
+  if [[ $file == *.zip ]]; then
+    payload "$folder/$file" "$sum" adapter_archive "$source_folder/$1/payload.xml" "$version"
+  else
+    payload "$folder/$file" "$sum" image "$(property "$descriptor" identificationCode)" \
+      "$version" "$(property "$descriptor" payloadSize)"
+  fi
   cp -f -- "$descriptor" "$folder/"
 }
 
-main() {
-  [[ $# -eq 1 ]] || fail 'usage: make_packages.sh FOLDER'
-  mkdir -p -- "$1"
-  local descriptor
+all_packages() {
+  local folder=$1 descriptor
   for descriptor in "$source_folder"/*.xml; do
-    package "$descriptor" "$1"
+    package "$(basename "$descriptor" .xml)" "$folder"
   done
   # A package on purpose without a descriptor: its payload is there, its .xml is not.
-  payload "$1/zeb_fw_rxc_r1ao60-3.20_anyos.upd" ZEB_rxc_r1ao60 3.20 16384
+  payload "$folder/zeb_fw_rxc_r1ao60-3.20_anyos.upd" '' image ZEB_rxc_r1ao60 3.20 16384
+}
+
+main() {
+  (($# > 0)) || fail 'usage: make_packages.sh FOLDER [PACKAGE...]'
+  local folder=$1 name
+  shift
+  mkdir -p -- "$folder"
+  scratch=$(mktemp -d)
+  trap 'rm -rf -- "$scratch"' EXIT
+  if (($# == 0)); then
+    all_packages "$folder"
+  fi
+  for name in "$@"; do
+    package "$name" "$folder"
+  done
 }
 
 main "$@"
