@@ -21,6 +21,9 @@ constexpr const char *kBroadcomService = "BRCMFWUP_SoftwareInstallationService";
 constexpr const char *kLsiService = "TAVU_SoftwareInstallationService";
 
 constexpr const char *kSuccess = "50: Package installation successfully.";
+constexpr const char *kError = "57: Package installation error happened.";
+constexpr const char *kFailed =
+    "54: Error when Create Input Parameter and the installation failed.";
 constexpr const char *kNothing = "57: No driver file name that need to be update.";
 
 void furnish(AdapterTest &test, const char *service, const VendorAnswer &answer) {
@@ -52,26 +55,124 @@ void furnish_qlogic(AdapterTest &test, const char *association, const char *serv
     end_job(test, 0);
 }
 
+constexpr const char *kElxUnpacked = "Minizip() successfully.\n";
+constexpr const char *kElxRemoved = "util_remove_file() successfully.\n";
+constexpr const char *kUnpacked = "minizip successfully.\n";
+constexpr const char *kRemoved = "util_remove_file successfully.\n";
+
 const std::array kFamilies = {
-    AdapterFamily{"EmulexFc", installElxFCPkg, kFcService, furnish_emulex_fc,
-                  return_from<kFcService>, kNothing, 4098, true, "Minizip() successfully.\n",
-                  nullptr, kSuccess, "util_remove_file() successfully.\n", true},
-    AdapterFamily{"EmulexCna", installElxCNAPkg, kCnaService, furnish_emulex_cna,
-                  return_from<kCnaService>, kNothing, 4098, true, "Minizip() successfully.\n",
-                  nullptr, kSuccess, "util_remove_file() successfully.\n", true},
-    AdapterFamily{"QlogicNic", installQlgPkg, kNicService, furnish_qlogic_nic, end_job, kNothing, 0,
-                  false, "minizip successfully.\n", kNothing, kNothing,
-                  "util_remove_file successfully.\n", false},
-    AdapterFamily{"QlogicFc", installQlgPkg, kQlogicFcService, furnish_qlogic_fc, end_job, kNothing,
-                  0, false, "minizip successfully.\n", kNothing, kNothing,
-                  "util_remove_file successfully.\n", false},
-    AdapterFamily{"Brocade", installBrocadePkg, kBrocadeService, furnish_brocade,
-                  return_from<kBrocadeService>, kNothing, 0, false, "minizip successfully.\n",
-                  nullptr, kSuccess, "util_remove_file successfully.\n", false},
-    AdapterFamily{"Broadcom", installBroadcomPkg, kBroadcomService, furnish_broadcom, end_update,
-                  nullptr, 0, false, "minizip successfully.\n", kSuccess, kSuccess, nullptr, false},
-    AdapterFamily{"Lsi", installLSIPkg, kLsiService, furnish_lsi, return_from<kLsiService>, nullptr,
-                  0, false, "minizip successfully.\n", kSuccess, kSuccess, nullptr, false},
+    AdapterFamily{
+        .name = "EmulexFc",
+        .install = installElxFCPkg,
+        .service = kFcService,
+        .furnish = furnish_emulex_fc,
+        .end_with = return_from<kFcService>,
+        .failure_report = kError,
+        .no_adapter_report = kNothing,
+        .no_adapter_result = 4098,
+        .must_unpack = true,
+        .unpacked_line = kElxUnpacked,
+        .matching = nullptr,
+        .nothing_report = kSuccess,
+        .removed_line = kElxRemoved,
+        .returns_removal = true,
+    },
+    AdapterFamily{
+        .name = "EmulexCna",
+        .install = installElxCNAPkg,
+        .service = kCnaService,
+        .furnish = furnish_emulex_cna,
+        .end_with = return_from<kCnaService>,
+        .failure_report = kError,
+        .no_adapter_report = kNothing,
+        .no_adapter_result = 4098,
+        .must_unpack = true,
+        .unpacked_line = kElxUnpacked,
+        .matching = nullptr,
+        .nothing_report = kSuccess,
+        .removed_line = kElxRemoved,
+        .returns_removal = true,
+    },
+    AdapterFamily{
+        .name = "QlogicNic",
+        .install = installQlgPkg,
+        .service = kNicService,
+        .furnish = furnish_qlogic_nic,
+        .end_with = end_job,
+        .failure_report = kFailed,
+        .no_adapter_report = kNothing,
+        .no_adapter_result = 0,
+        .must_unpack = false,
+        .unpacked_line = kUnpacked,
+        .matching = kNothing,
+        .nothing_report = kNothing,
+        .removed_line = kRemoved,
+        .returns_removal = false,
+    },
+    AdapterFamily{
+        .name = "QlogicFc",
+        .install = installQlgPkg,
+        .service = kQlogicFcService,
+        .furnish = furnish_qlogic_fc,
+        .end_with = end_job,
+        .failure_report = kFailed,
+        .no_adapter_report = kNothing,
+        .no_adapter_result = 0,
+        .must_unpack = false,
+        .unpacked_line = kUnpacked,
+        .matching = kNothing,
+        .nothing_report = kNothing,
+        .removed_line = kRemoved,
+        .returns_removal = false,
+    },
+    AdapterFamily{
+        .name = "Brocade",
+        .install = installBrocadePkg,
+        .service = kBrocadeService,
+        .furnish = furnish_brocade,
+        .end_with = return_from<kBrocadeService>,
+        .failure_report = kError,
+        .no_adapter_report = kNothing,
+        .no_adapter_result = 0,
+        .must_unpack = false,
+        .unpacked_line = kUnpacked,
+        .matching = nullptr,
+        .nothing_report = kSuccess,
+        .removed_line = kRemoved,
+        .returns_removal = false,
+    },
+    AdapterFamily{
+        .name = "Broadcom",
+        .install = installBroadcomPkg,
+        .service = kBroadcomService,
+        .furnish = furnish_broadcom,
+        .end_with = end_update,
+        .failure_report = kError,
+        .no_adapter_report = nullptr,
+        .no_adapter_result = 0,
+        .must_unpack = false,
+        .unpacked_line = kUnpacked,
+        .matching = kSuccess,
+        .nothing_report = kSuccess,
+        .removed_line = nullptr,
+        .returns_removal = false,
+    },
+    AdapterFamily{
+        .name = "Lsi",
+        .install = installLSIPkg,
+        .service = kLsiService,
+        .furnish = furnish_lsi,
+        .end_with = return_from<kLsiService>,
+        .failure_report = kError,
+        .no_adapter_report = nullptr,
+        .no_adapter_result = 0,
+        .must_unpack = false,
+        .unpacked_line = kUnpacked,
+        .matching = kSuccess,
+        .nothing_report = kSuccess,
+        .removed_line = nullptr,
+        .returns_removal = false,
+    },
 };
 
 }  // namespace

@@ -24,6 +24,8 @@ struct AdapterFamily {
     // From now on the vendor's service lets payloads end like this.
     void (*end_with)(AdapterTest &test, int result);
 
+    const char *failure_report;  // of a payload that ends with 2 or cannot be started
+
     const char *no_adapter_report;  // null where adapters are not looked for
     int no_adapter_result;
 
