@@ -48,7 +48,8 @@ extern "C" [[gnu::visibility("default")]] int velktest_minizip(const char *archi
 extern "C" void *__real_dlopen(const char *name, int mode);
 extern "C" void *__real_dlsym(void *library, const char *name);
 
-extern "C" void *__wrap_dlopen(const char *name, int mode) {
+// Visible, because sanitizers' libraries refer to the same names.
+extern "C" [[gnu::visibility("default")]] void *__wrap_dlopen(const char *name, int mode) {
     if (velktest::active == nullptr || name == nullptr || velktest::kLibrary != name) {
         return __real_dlopen(name, mode);
     }
@@ -63,7 +64,7 @@ extern "C" void *__wrap_dlopen(const char *name, int mode) {
     }
 }
 
-extern "C" void *__wrap_dlsym(void *library, const char *name) {
+extern "C" [[gnu::visibility("default")]] void *__wrap_dlsym(void *library, const char *name) {
     if (velktest::active == nullptr || library != RTLD_DEFAULT || velktest::kFunction != name) {
         return __real_dlsym(library, name);
     }
