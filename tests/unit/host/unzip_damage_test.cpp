@@ -111,7 +111,9 @@ TEST_F(UnzipDamage, WrongChecksumKeepsTheFileThatWasThere) {
 }
 
 TEST_F(UnzipDamage, DamagedDeflateDataLeavesNothing) {
-    ZipEntry entry = deflated("a", std::string(200'000, 'x') + "and more");
+    std::string content(200'000, 'x');
+    content += "and more";
+    ZipEntry entry = deflated("a", content);
     entry.content[entry.content.size() / 2] = '\x7F';
     EXPECT_EQ(unpack({entry}), kMinizipDamaged);
     EXPECT_THAT(unpacked(), IsEmpty());
