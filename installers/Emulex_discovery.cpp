@@ -23,15 +23,16 @@ const char *text_or_empty(const char *text) {
 class WalkedAdapters {
   public:
     // False for an identifier that is known already, and when the list is full.
-    bool add(std::string_view identifier) {
+    bool add(std::string_view text) {
+        const Text<kIdentifierSize> identifier(text);
         const auto known = std::span(identifiers_).first(count_);
-        const bool seen = std::any_of(known.rbegin(), known.rend(), [=](const auto &entry) {
-            return view(entry.c_str()) == identifier;
+        const bool seen = std::any_of(known.rbegin(), known.rend(), [&](const auto &entry) {
+            return view(entry.c_str()) == view(identifier.c_str());
         });
         if (seen || count_ == identifiers_.size()) {
             return false;
         }
-        identifiers_[count_++] = Text<kIdentifierSize>(identifier);
+        identifiers_[count_++] = identifier;
         return true;
     }
 

@@ -70,7 +70,9 @@ class TrimmedDfn {
     [[nodiscard]] std::string_view view() const { return velk::view(text_.c_str()); }
 
   private:
-    Text<kFieldSize> text_;
+    static constexpr std::size_t kRawSize = 1024;  // blanks around it may be many
+
+    Text<kRawSize> text_;
 };
 
 }  // namespace velk::adapter
