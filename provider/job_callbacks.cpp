@@ -61,12 +61,14 @@ int getVELKStatus(const char *instance_id, int *job_state, char *message, int me
     if (!LineReader(path->c_str()).next(line)) {
         return 0;
     }
+    const char *told = line;
     if (message != nullptr && message_size > 0) {
         const std::span<char> text(message, static_cast<std::size_t>(message_size));
         copy(text, view(line));
         text.back() = '\0';
+        told = message;
     }
-    record_query(instance_id, message == nullptr ? line : message);
+    record_query(instance_id, told);
     if (job_state != nullptr) {
         *job_state = job_state_of(view(line));
     }
