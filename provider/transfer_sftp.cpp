@@ -2,7 +2,6 @@
 
 #include "provider/transfer.h"
 #include "provider/transfer_call.h"
-#include "velk/bounded_text.h"
 #include "velk/debug_log.h"
 #include "velk/package_table.h"
 #include "velk/status_report.h"
@@ -14,7 +13,6 @@ constexpr std::uint16_t kOption = 1;
 constexpr int kTransferStarted = 6;
 constexpr unsigned kPollSeconds = 10;
 constexpr int kAttempts = 3;
-constexpr std::size_t kStatusSize = 1024;
 
 // CIM_ConcreteJob.JobState (DSP1103).
 constexpr int kJobRunning = 4;
