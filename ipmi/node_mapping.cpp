@@ -101,7 +101,7 @@ struct KeptLines {
     bool read() {
         LineReader file(kNodeMapping);
         while (count < lines.size() && file.next(lines[count])) {
-            ++count;
+            count += view(lines[count]).size() >= kMinLine ? 1 : 0;
         }
         return file.is_open();
     }
@@ -123,6 +123,7 @@ int getNodeNumber(int *count) {
     if (count == nullptr) {
         return -1;
     }
+    *count = 0;
     LineReader file(kNodeMapping);
     if (!file.is_open()) {
         return 1;
