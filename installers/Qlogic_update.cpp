@@ -85,11 +85,12 @@ Ports install_through(const PortController &kind, int index, const CMPIContext *
     return found;
 }
 
-// The network function first; the Fibre Channel one only where there is no network function.
+// The network function first; the Fibre Channel one only where there is no network function. Where
+// that cannot be found out, neither.
 void install_adapter(int index, const CMPIContext *context, const CMPIInstance *adapter,
                      int &result) {
     log_entry("Try to get QLogic_NIC_PortController first.\n");
-    if (install_through(kNic, index, context, adapter, result) == Ports::kFound) {
+    if (install_through(kNic, index, context, adapter, result) != Ports::kNone) {
         return;
     }
     log_entry("No instance found for QLogic_NIC_PortController.\n");
