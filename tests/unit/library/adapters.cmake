@@ -14,10 +14,15 @@ if(TARGET velkbmc_device)
       adapter_families.cpp
       adapter_fixture.cpp
       adapter_frame_test.cpp
+      adapter_service_test.cpp
       adapter_session_test.cpp
       adapter_status_test.cpp
       adapter_watching_test.cpp
       controller_stand.cpp
+      emulex_discovery_test.cpp
+      emulex_install_test.cpp
+      qlogic_adapters_test.cpp
+      qlogic_payload_test.cpp
       unpack_test.cpp
     LIBS velk_broker_test_support velk_unzip_double velkbmc_device ${VELK_UNITS})
 endif()
