@@ -17,6 +17,7 @@ constexpr unsigned kPollSeconds = 10;
 
 // The Broadcom service's CheckStatus.
 constexpr int kUpdateRunning = 1;
+constexpr int kStatusUnknown = -1;  // our own: it told none, which must not pass for a success
 
 // The LSI service's own return values.
 constexpr int kLevelCurrent = 12;
@@ -136,7 +137,7 @@ int check_status(const CMPIContext *context, const cim::Path &service) {
     log_entry("Enter GetBRCMJob Status.\n");
     const cim::Call call = cim::invoke(context, service, "CheckStatus", in, out);
     log_format("CheckStatus Retcode:%d\n", call.value);
-    const int status = cim::int_of(cim::argument(out.get(), "status"));
+    const int status = cim::int_of(cim::argument(out.get(), "status"), kStatusUnknown);
     log_format("CheckStatus status is :%d\n", status);
     return status;
 }

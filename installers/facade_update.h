@@ -16,7 +16,7 @@ VELK_API int installLSIpayload(int idx, const CMPIContext *context, const char *
 
 // Starts the update and asks for its status every 10 seconds until it is done. Returns 0 then, 1
 // when the service path could not be built, 4098 when the call failed or started no job, else the
-// final status.
+// final status, -1 when the service no longer tells one.
 VELK_API int installSingleBroadcompayload(const CMPIContext *context, const char *directory);
 
 // Returns what the vendor's InstallFromURI returned, 1 when the service path could not be built,

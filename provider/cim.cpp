@@ -119,7 +119,7 @@ const char *text_of(const CMPIData &data) {
     }
 }
 
-int int_of(const CMPIData &data) {
+int int_of(const CMPIData &data, int otherwise) {
     switch (data.type) {
         case CMPI_uint8:
             return data.value.uint8;
@@ -138,7 +138,7 @@ int int_of(const CMPIData &data) {
         case CMPI_sint64:
             return static_cast<int>(data.value.sint64);
         default:
-            return 0;
+            return otherwise;
     }
 }
 

@@ -67,8 +67,8 @@ bool is_present(const CMPIStatus &status, const CMPIData &data);
 const char *text_of(const CMPIString *string);
 const char *text_of(const CMPIData &data);
 
-// The number in `data` when it is an integer of any width, else 0.
-int int_of(const CMPIData &data);
+// The number in `data` when it is an integer of any width, else `otherwise`.
+int int_of(const CMPIData &data, int otherwise = 0);
 
 // The message of a status, empty when it has none.
 const char *message_of(const CMPIStatus &status);
