@@ -13,11 +13,9 @@
 namespace velk::emulex {
 namespace {
 
-constexpr const char *kNamespace = "root/emulex";
+using adapter::text_or_empty;
 
-const char *text_or_empty(const char *text) {
-    return text == nullptr ? "" : text;
-}
+constexpr const char *kNamespace = "root/emulex";
 
 // The identifiers of the adapters that have been walked: the ports of one adapter share theirs.
 class WalkedAdapters {

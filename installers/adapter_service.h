@@ -59,6 +59,11 @@ int install_payloads(int index, const char *payload_format, const char *failure_
     return 0;
 }
 
+// For log lines.
+inline const char *text_or_empty(const char *text) {
+    return text == nullptr ? "" : text;
+}
+
 // Appends an adapter to the package's `DFNDeviceIDArray`. Returns false when the table is full.
 bool add_device(PackageRecord &package, std::string_view dfn, std::string_view device_id);
 

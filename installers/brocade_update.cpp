@@ -44,24 +44,28 @@ constexpr adapter::AdapterFamily kFamily = {
     .statuses = kStatuses,
 };
 
+// A text that is missing is not the same as any other.
+bool is_same(const char *left, const char *right) {
+    return left != nullptr && right != nullptr && view(left) == view(right);
+}
+
 // The ports of one physical package. `port` goes on where the last walk stopped: at the end.
 void add_ports(PackageRecord &package, const CMPIInstance *physical_package,
                cim::Instances::Iterator &port) {
     const adapter::TrimmedDfn dfn("Brocade",
                                   cim::text_of(cim::property(physical_package, "Model")));
-    const Text<kFieldSize> serial(
-        view(cim::text_of(cim::property(physical_package, "SerialNumber"))));
-    log_format("SerialNumber is %s\n", serial.c_str());
+    const char *serial = cim::text_of(cim::property(physical_package, "SerialNumber"));
+    log_format("SerialNumber is %s\n", adapter::text_or_empty(serial));
     for (; port != cim::Instances::end(); ++port) {
-        const Text<kFieldSize> name(view(cim::text_of(cim::property(*port, "Name"))));
-        log_format("PortName is %s\n", name.c_str());
-        if (view(name.c_str()) != view(serial.c_str())) {
+        const char *name = cim::text_of(cim::property(*port, "Name"));
+        log_format("PortName is %s\n", adapter::text_or_empty(name));
+        if (!is_same(name, serial)) {
             continue;
         }
         log_entry("find the supported deviceid.");
-        const Text<kFieldSize> device(view(cim::text_of(cim::property(*port, "DeviceID"))));
-        log_format("Port DeviceId is %s\n", device.c_str());
-        adapter::add_device(package, dfn.view(), view(device.c_str()));
+        const char *device = cim::text_of(cim::property(*port, "DeviceID"));
+        log_format("Port DeviceId is %s\n", adapter::text_or_empty(device));
+        adapter::add_device(package, dfn.view(), view(device));
     }
 }
 
