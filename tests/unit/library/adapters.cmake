@@ -18,9 +18,12 @@ if(TARGET velkbmc_device)
       adapter_session_test.cpp
       adapter_status_test.cpp
       adapter_watching_test.cpp
+      broadcom_test.cpp
+      brocade_test.cpp
       controller_stand.cpp
       emulex_discovery_test.cpp
       emulex_install_test.cpp
+      lsi_test.cpp
       qlogic_adapters_test.cpp
       qlogic_payload_test.cpp
       unpack_test.cpp
