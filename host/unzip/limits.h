@@ -7,7 +7,7 @@
 
 namespace velkhost::unzip {
 
-inline constexpr std::uint64_t kMebibyte = 1024 * 1024;
+inline constexpr std::uint64_t kMebibyte = std::uint64_t{1024} * 1024;
 
 // Entries. A package has some hundred files at most: payloads, tools, notices.
 inline constexpr std::uint64_t kMaxEntries = 4096;

@@ -10,7 +10,7 @@
 namespace velkhost::unzip {
 
 struct PlannedEntry {
-    std::uint64_t index;
+    std::uint64_t index = 0;
     EntryName name;
 };
 
