@@ -120,13 +120,11 @@ std::vector<std::string> split_lines(const std::string &text) {
     return out;
 }
 
-// The first line follows what the firmware wrote without a line end.
 std::vector<std::string> guest_lines(const std::vector<std::string> &console) {
     std::vector<std::string> out;
     for (const std::string &line : console) {
-        const std::size_t at = line.find(kGuestLine);
-        if (at != std::string::npos) {
-            out.push_back(line.substr(at + kGuestLine.size()));
+        if (line.starts_with(kGuestLine)) {
+            out.push_back(line.substr(kGuestLine.size()));
         }
     }
     return out;

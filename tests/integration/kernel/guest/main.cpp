@@ -4,9 +4,11 @@
 #include "tests/integration/kernel/guest/machine_setup.h"
 #include "tests/integration/kernel/guest/text.h"
 
+#include <cstdio>
 #include <cstdlib>
 
 int main() {
+    std::puts("");  // the firmware leaves its last line open
     if (velkguest::set_up()) {
         // The kernel hands parameters that it does not know to its first process.
         const char *const actions = std::getenv("velk_actions");
