@@ -11,14 +11,24 @@ endforeach()
 
 include(GoogleTest)
 
+# The headers that most tests take, read once for all test programs: a test's time in the compiler
+# goes to GoogleTest's headers and to the optimiser.
+file(CONFIGURE OUTPUT ${CMAKE_BINARY_DIR}/test_headers.cpp CONTENT "")
+# A program, because it is compiled as those that take the headers from it.
+add_executable(velk_test_headers EXCLUDE_FROM_ALL ${CMAKE_BINARY_DIR}/test_headers.cpp)
+target_link_libraries(velk_test_headers PRIVATE velk_options gmock_main)
+target_precompile_headers(velk_test_headers PRIVATE
+  <gmock/gmock.h> <gtest/gtest.h>
+  <algorithm> <array> <atomic> <filesystem> <fstream> <map> <thread>)
+target_compile_options(velk_test_headers PRIVATE $<$<CONFIG:Release>:-O0>)
+
 # velk_add_tests(NAME SOURCES... [LIBS ...] [LABEL ...])
 # Each TEST becomes a ctest case of its own and so runs in a process of its own.
 function(velk_add_tests name)
   cmake_parse_arguments(ARG "" "LABEL" "SOURCES;LIBS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
   target_link_libraries(${name} PRIVATE velk_options ${ARG_LIBS} gmock_main)
-  # Most of a test's time in the compiler goes to GoogleTest's headers and to the optimiser.
-  target_precompile_headers(${name} PRIVATE <gmock/gmock.h> <gtest/gtest.h>)
+  target_precompile_headers(${name} REUSE_FROM velk_test_headers)
   target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
   # A parameter's value would bring addresses into the names.
   gtest_discover_tests(${name} TEST_PREFIX "${ARG_LABEL}." NO_PRETTY_VALUES DISCOVERY_TIMEOUT 120
