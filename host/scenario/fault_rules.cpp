@@ -38,7 +38,8 @@ std::optional<Fault> FaultRules::take(std::string_view step, std::string_view su
     const std::lock_guard lock(mutex_);
     for (Counted &counted : rules_) {
         if (concerns(counted.rule, step, subject) && counted.strikes()) {
-            return Fault{counted.rule.code, counted.rule.message, counted.rule.controller};
+            const FaultRule &rule = counted.rule;
+            return Fault{rule.code, rule.message, rule.controller, rule.transfer};
         }
     }
     return std::nullopt;

@@ -16,6 +16,7 @@ struct Fault {
     int code = 0;  // as in the rule
     std::string message;
     ControllerFault controller = ControllerFault::kNone;
+    TransferFault transfer = TransferFault::kNone;
 };
 
 // Safe to use from any thread.

@@ -26,6 +26,7 @@ constexpr std::array kFamilies{
     Family{"broker.",       Rest::kName,    CodeKind::kCimStatus},
     Family{"job.",          Rest::kName,    CodeKind::kCimStatus},
     Family{"zeb.",          Rest::kName,    CodeKind::kCimStatus},
+    Family{"filetransfer.fetch", Rest::kNothing, CodeKind::kTransfer},
     Family{"filetransfer.", Rest::kName,    CodeKind::kCimStatus},
     Family{"emulex_fc.",    Rest::kName,    CodeKind::kCimStatus},
     Family{"emulex_cna.",   Rest::kName,    CodeKind::kCimStatus},

@@ -10,7 +10,7 @@
 namespace velkhost::scenario {
 
 // What a fault's code means to whoever serves the step.
-enum class CodeKind { kErrno, kCimStatus, kController };
+enum class CodeKind { kErrno, kCimStatus, kController, kTransfer };
 
 // The kind of a step's code; no value for a step that nobody serves. Known are the shim's libc
 // calls ("open:/tmp/...", "thread.create"), and the steps of the broker ("broker.newObjectPath"),

@@ -33,10 +33,21 @@ struct JobSettings {
     std::uint32_t first_number = 1;   // number of the first job: 1 gives "VELK-1"
 };
 
-// [file_transfer]
+// [file_transfer]. All paths are absolute.
 struct FileTransferSettings {
-    // Files (absolute paths) that count as transferred by the service before the run began.
+    // Files that count as transferred by the service before the run began.
     std::vector<std::string> transferred;
+    // How the service shows other machines who it is, unless a location itself says so.
+    std::optional<std::string> user;
+    std::optional<std::string> password;
+    std::optional<std::string> private_key;  // file of an SSH key without a passphrase
+    // File of the SSH servers that the service trusts (sshd(8)); no value: it trusts none.
+    std::optional<std::string> known_hosts;
+    std::uint32_t connect_seconds = 30;      // real time that a server has to let the service in
+    std::uint32_t stall_seconds = 60;        // for how long nothing may come
+    std::uint32_t bytes_per_second = 0;      // speed of the link by the host's clock; 0: endless
+    std::optional<std::uint32_t> capacity;   // bytes that the file store takes; no value: its disk
+    std::uint32_t at_once = 4;               // how many jobs transfer at the same time
 };
 
 // DMTF job states (CIM_ConcreteJob.JobState) that the services use.
@@ -132,6 +143,15 @@ enum class ControllerFault {
     kLonger,          // the answer is filled up with zeros
 };
 
+// What a fault at the step "filetransfer.fetch" does to a transfer.
+enum class TransferFault {
+    kNone,    // the fault is none of a transfer's
+    kRefuse,  // the server cannot be reached
+    kStall,   // nothing comes any more after the first piece
+    kCut,     // the file ends early
+    kFull,    // the file store's disk is full
+};
+
 // A fault strikes at a named step: it lets `after` passes of the step go by, then strikes `count`
 // times. A step that ends in '*' stands for all that begin so. `match` narrows it to passes whose
 // subject (a URI, a class name, a job id) contains it; empty matches all.
@@ -146,6 +166,7 @@ struct FaultRule {
     std::string message;  // status message, for steps that carry one
     // With kCompletionCode `code` is that code, with kLate the seconds, with kLonger the bytes.
     ControllerFault controller = ControllerFault::kNone;
+    TransferFault transfer = TransferFault::kNone;
     int line = 0;  // where the rule stands in its file; 0 when it comes from elsewhere
 };
 

@@ -6,6 +6,7 @@
 #include "host/scenario/read_file.h"
 #include "host/scenario/service_reader.h"
 #include "host/scenario/table_reader.h"
+#include "host/scenario/transfer_reader.h"
 
 #include <cerrno>
 #include <cstring>
@@ -38,18 +39,6 @@ JobSettings read_jobs(TableReader in) {
     assign(jobs.first_number, in.number("first_number", 1, 1'000'000'000));
     in.finish();
     return jobs;
-}
-
-FileTransferSettings read_file_transfer(TableReader in) {
-    FileTransferSettings settings;
-    assign(settings.transferred, in.texts("transferred"));
-    for (const std::string &path : settings.transferred) {
-        if (!path.starts_with('/')) {
-            in.fail("transferred", "must hold absolute paths, not \"" + path + '"');
-        }
-    }
-    in.finish();
-    return settings;
 }
 
 int read_errno(TableReader &in) {
@@ -106,6 +95,11 @@ FaultRule read_fault(TableReader in) {
     rule.count = read_count(in);
     if (*kind == CodeKind::kController) {
         read_controller_fault(in, rule);
+        in.finish();
+        return rule;
+    }
+    if (*kind == CodeKind::kTransfer) {
+        rule.transfer = read_transfer_action(in);
         in.finish();
         return rule;
     }

@@ -36,8 +36,8 @@ TEST_P(ScenarioReaderErrors, NameFileLineAndReason) {
 
 constexpr const char *kSteps =
     "open:/path, unlink:/path, rmdir:/path, opendir:/path, dlopen:/path, thread.create, "
-    "broker.name, job.name, zeb.name, filetransfer.name, emulex_fc.name, emulex_cna.name, "
-    "qlogic.name, brocade.name, broadcom.name, lsi.name, bmc.name";
+    "broker.name, job.name, zeb.name, filetransfer.fetch, filetransfer.name, emulex_fc.name, "
+    "emulex_cna.name, qlogic.name, brocade.name, broadcom.name, lsi.name, bmc.name";
 
 const std::string kNoStep =
     std::string("2: [fault] \"step\" is none that is served; served are ") + kSteps;
@@ -81,7 +81,8 @@ INSTANTIATE_TEST_SUITE_P(Jobs, ScenarioReaderErrors, ::testing::Values(
     Mistake{"FirstZero", "[jobs]\nfirst_number = 0", "2: [jobs] \"first_number\" must be from 1 to 1000000000, not 0"}), name_of);
 
 INSTANTIATE_TEST_SUITE_P(FileTransfer, ScenarioReaderErrors, ::testing::Values(
-    Mistake{"UnknownKey", "[file_transfer]\nx = 1", "2: [file_transfer] unknown key \"x\"; known are transferred"},
+    Mistake{"UnknownKey", "[file_transfer]\nx = 1", "2: [file_transfer] unknown key \"x\"; known are transferred, user, password, private_key, known_hosts, "
+            "connect_seconds, stall_seconds, bytes_per_second, capacity, at_once"},
     Mistake{"NoArray", "[file_transfer]\ntransferred = '/a'",
             "2: [file_transfer] \"transferred\" must be an array of strings, not a string"},
     Mistake{"NoStrings", "[file_transfer]\ntransferred = [\n'/a',\n2]",
