@@ -22,6 +22,7 @@ BrokerTest::BrokerTest() {
     add_service(controller_);
     add_service(job_);
     add_service(transfer_);
+    add_service(transfer_job_);
     ZEB_VMWarePackageInstallationBroker = watch_.broker();
 }
 

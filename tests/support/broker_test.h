@@ -41,6 +41,7 @@ class BrokerTest : public LibraryTest {
     ManagementController &controller() { return controller_; }
     UpdateJob &job() { return job_; }
     FileTransfer &transfer() { return transfer_; }
+    UpdateJob &transfer_job() { return transfer_job_; }
 
   private:
     void add_service(DoubleBase &service);
@@ -51,6 +52,7 @@ class BrokerTest : public LibraryTest {
     ManagementController controller_;
     UpdateJob job_;
     FileTransfer transfer_;
+    UpdateJob transfer_job_{"ZEB_TransferJob"};
 };
 
 }  // namespace velktest

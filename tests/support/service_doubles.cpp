@@ -63,13 +63,15 @@ kit::Instance UpdateJob::read(const kit::Path &) {
     if (!look) {
         fail_not_found();
     }
-    kit::Instance instance{{}, *look};
-    instance.properties.push_back({"JobState", std::uint16_t{4}});
-    return instance;
+    return {{}, *look};
 }
 
 kit::MethodResult FileTransfer::invoke(const kit::Path &, const std::string &method,
                                        const kit::Args &in) {
+    if (on_transfer && (method == "TransferViaTFTP" || method == "TransferViaURL")) {
+        EXPECT_EQ(in.uint16s("TransferOptions").size(), 1U);
+        return result_of(on_transfer(in.text("SourceURI")));
+    }
     EXPECT_EQ(method, "DeleteTransferredFile");
     deleted.push_back(in.text("FileURI"));
     return result_of(end);

@@ -64,15 +64,20 @@ class ManagementController : public DoubleBase {
     std::vector<Order> orders;
 };
 
-// The job that it starts: one look after the other, then no instance any more.
+// A job that a service starts: one look after the other, then no instance any more.
 class UpdateJob : public DoubleBase {
   public:
-    [[nodiscard]] const char *class_name() const override { return "ZEB_UpdateJob"; }
+    explicit UpdateJob(const char *class_name = "ZEB_UpdateJob") : class_name_(class_name) {}
+
+    [[nodiscard]] const char *class_name() const override { return class_name_; }
     kit::Instance read(const kit::Path &path) override;
 
-    // `status` is its JobStatus; null for none; no value for a job that cannot be had.
-    void show(kit::Value status) { looks_.push_back(Look{{"JobStatus", std::move(status)}}); }
-    void show_nothing() { looks_.push_back(Look{}); }
+    // `status` is its JobStatus; null for none; no value for a job that cannot be had. `state` is
+    // its JobState.
+    void show(kit::Value status, kit::Value state = std::uint16_t{4}) {
+        looks_.push_back(Look{{"JobStatus", std::move(status)}, {"JobState", std::move(state)}});
+    }
+    void show_nothing() { looks_.push_back(Look{{"JobState", std::uint16_t{4}}}); }
     void hide() { looks_.emplace_back(); }
 
     // Whether every look was taken.
@@ -80,6 +85,7 @@ class UpdateJob : public DoubleBase {
 
   private:
     using Look = std::vector<kit::Property>;
+    const char *class_name_;
     std::deque<std::optional<Look>> looks_;
 };
 
@@ -90,8 +96,11 @@ class FileTransfer : public DoubleBase {
     kit::MethodResult invoke(const kit::Path &target, const std::string &method,
                              const kit::Args &in) override;
 
-    MethodEnd end;
+    MethodEnd end;  // of a removal
     std::vector<std::string> deleted;
+
+    // What becomes of a transfer of the file at `source`; none is expected unless this is set.
+    std::function<MethodEnd(const std::string &source)> on_transfer;
 };
 
 // The request that a test runs in: a method whose body the test sets.
