@@ -174,8 +174,12 @@ CMPIInstance *VendorClass::make(const std::string &class_name,
     return out;
 }
 
-CMPIStatus VendorClass::enumerate(const CMPIResult *result) const {
-    for (const VendorInstance &instance : instances) {
+CMPIStatus VendorClass::enumerate(const CMPIResult *result) {
+    const auto found = enumerations.empty() ? std::optional(instances) : take(enumerations);
+    if (!found) {
+        return {CMPI_RC_ERR_FAILED, nullptr};
+    }
+    for (const VendorInstance &instance : *found) {
         CMReturnInstance(result, make(name_, instance));
     }
     CMReturnDone(result);

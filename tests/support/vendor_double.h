@@ -48,6 +48,10 @@ class VendorClass {
     // What an enumeration finds.
     std::vector<VendorInstance> instances;
 
+    // What one enumeration after the other finds instead, the last one for ever; no value for one
+    // that fails.
+    std::deque<std::optional<std::vector<VendorInstance>>> enumerations;
+
     // What an instance shows when it is asked for by name: one look after the other, the last one
     // for ever. Without any there is no such instance.
     std::deque<NamedValues> looks;
@@ -71,7 +75,7 @@ class VendorClass {
 
     [[nodiscard]] CMPIInstance *make(const std::string &class_name,
                                      const VendorInstance &instance) const;
-    CMPIStatus enumerate(const CMPIResult *result) const;
+    CMPIStatus enumerate(const CMPIResult *result);
     CMPIStatus read(const CMPIResult *result);
     CMPIStatus traverse(const CMPIResult *result, const CMPIObjectPath *source,
                         const char *result_class) const;
