@@ -7,11 +7,13 @@ source "$(dirname -- "${BASH_SOURCE[0]}")/scripts/packages.sh"
 
 usage() {
   cat <<'TEXT'
-usage: ./run.sh [--] [ARGUMENT...]
+usage: ./run.sh [--packages LIST] [--] [ARGUMENT...]
 
 Builds what is missing and runs `velkhost install` on the example packages, as
-scenarios/default.toml describes the host. Arguments go to that command, such as
---json, --clock real, --scenario FILE; package URIs among them replace the examples.
+scenarios/default.toml describes the host.
+  --packages LIST   those of examples/LIST.list: default, firmware or adapters
+Other arguments go to velkhost, such as --json, --clock real, --scenario FILE; package
+URIs among them replace the examples.
 The exit code is velkhost's, or 3 when packages must be installed by hand first. Without
 arguments it is 0 when the examples end as they are meant to.
 TEXT
@@ -35,14 +37,14 @@ packages_folder() {
   say "$folder"
 }
 
-# The example packages in the order of the request, as file:// URIs, one a line.
+# example_uris LIST: its packages in the order of the request, as file:// URIs, one a line.
 example_uris() {
-  local folder name
+  local list=$root/examples/$1.list folder name
   folder=$(packages_folder)
   bash "$root/examples/make_packages.sh" "$folder" >&2
   while read -r name; do
     [[ -z $name || $name == '#'* ]] || say "file://$folder/$name"
-  done <"$root/examples/default.list"
+  done <"$list"
 }
 
 # install ARGUMENT...: runs the command in place of this shell.
@@ -59,6 +61,12 @@ show_examples() {
 }
 
 main() {
+  local list=default
+  if [[ ${1-} == --packages ]]; then
+    list=${2-}
+    [[ -f $root/examples/$list.list ]] || die "--packages needs the name of a list: default, firmware or adapters"
+    shift 2
+  fi
   [[ ${1-} != -- ]] || shift
   local argument scenario=(--scenario "$root/scenarios/default.toml") own_uris='' uris=() examples
   for argument in "$@"; do
@@ -71,10 +79,10 @@ main() {
   ensure_packages run
   (cd "$root" && build)
   if [[ ! $own_uris ]]; then
-    examples=$(example_uris)
+    examples=$(example_uris "$list")
     mapfile -t uris <<<"$examples"
   fi
-  if (($#)); then
+  if (($#)) || [[ $list != default ]]; then
     install "${scenario[@]}" "$@" "${uris[@]}"
   else
     show_examples "${scenario[@]}" "${uris[@]}"

@@ -7,6 +7,7 @@
 #include "host/cli/output.h"
 #include "host/cli/plain_view.h"
 #include "host/cli/result_table.h"
+#include "host/cli/stdout_capture.h"
 
 #include <fmt/format.h>
 #include <unistd.h>
@@ -57,9 +58,10 @@ int trouble(Output &errors, const std::exception &error) {
 }  // namespace
 
 int run_install(const InstallOptions &options, Interrupt &interrupt) {
-    Output output(STDOUT_FILENO);
+    const OwnStdout own_stdout;
+    Output output(own_stdout.fd());
     Output errors(STDERR_FILENO);
-    const Terminal terminal = Terminal::of(STDOUT_FILENO);
+    const Terminal terminal = Terminal::of(output.fd());
     for (const std::string &warning : location_warnings(split_locations(options.uris))) {
         errors.write(fmt::format("velkhost: {}\n", warning));
     }

@@ -16,6 +16,9 @@ namespace {
 
 constexpr std::int64_t kMicrosPerSecond = 1'000'000;
 
+// Where such a host's init system puts what its broker and the providers print.
+constexpr const char *kBrokerOutput = "/var/log/broker-stdout.txt";
+
 // The machine's own time, whatever the host's clock shows: not through libc.
 double real_seconds() {
     timespec now{};
@@ -54,10 +57,12 @@ InstallRun::InstallRun(const InstallOptions &options, Interrupt &interrupt, View
         }
     });
     interrupt_.add([this] { view_.abandon(); });
+    libraries_output_.emplace(rig_->folder().inside(kBrokerOutput));
 }
 
 InstallRun::~InstallRun() {
     const auto held = interrupt_.hold();
+    libraries_output_.reset();
     rig_.reset();
     interrupt_.drop();
     interrupt_.drop();
@@ -187,6 +192,7 @@ void InstallRun::fill_places() {
     }
     const rig::RunFolder &folder = rig_->folder();
     report_.folder = folder.path().string();
+    report_.broker_output = folder.inside(kBrokerOutput).string();
     report_.debug_log = folder.inside("/tmp/velkdebug.txt").string();
     if (report_.job) {
         report_.status_file = folder.inside(status_file_of(report_.job->id)).string();

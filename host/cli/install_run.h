@@ -4,6 +4,7 @@
 #include "host/cli/install_options.h"
 #include "host/cli/interrupt.h"
 #include "host/cli/report.h"
+#include "host/cli/stdout_capture.h"
 #include "host/cli/view.h"
 #include "host/rig/rig.h"
 
@@ -48,6 +49,7 @@ class InstallRun {
     const double real_start_;
     std::vector<std::string> locations_;
     std::optional<rig::Rig> rig_;
+    std::optional<StdoutCapture> libraries_output_;
     RunReport report_;
     std::int64_t next_look_us_ = 0;  // at the job
 };

@@ -76,6 +76,7 @@ Json of_history(const std::vector<HistoryReport> &history) {
 Json of_files(const RunReport &report) {
     return {{"folder", nullable(report.folder)},
             {"debug_log", nullable(report.debug_log)},
+            {"broker_output", nullable(report.broker_output)},
             {"status_file", nullable(report.status_file)}};
 }
 

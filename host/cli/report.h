@@ -79,6 +79,7 @@ struct RunReport {
     bool limit_reached = false;
     std::string folder;  // empty: it is gone
     std::string debug_log;
+    std::string broker_output;  // what the libraries printed
     std::string status_file;
     std::vector<std::string> findings;
     std::vector<std::string> unfired_faults;

@@ -25,9 +25,6 @@ struct StatusChange {
     PackageStatus status;
 };
 
-// What changed from one line to the next. A package that a line no longer shows has not changed.
-std::vector<StatusChange> changes_between(const StatusLine &before, const StatusEntry &after);
-
 // Safe to use from any thread.
 class StatusHistory {
   public:
@@ -42,10 +39,14 @@ class StatusHistory {
     void clear();
 
     [[nodiscard]] std::vector<StatusEntry> entries() const;
+    // A package that a line no longer shows has not changed, nor has one that is merely cut.
     [[nodiscard]] std::vector<StatusChange> changes() const;
 
   private:
+    void note(StatusChange change);
+
     mutable std::recursive_mutex mutex_;  // a listener may ask for what there is
+    std::vector<PackageStatus> known_;    // as far as the lines have shown
     std::vector<StatusEntry> entries_;
     std::vector<StatusChange> changes_;
     Listener listener_;

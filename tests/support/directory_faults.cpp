@@ -22,14 +22,15 @@ DirectoryFaults::~DirectoryFaults() {
 
 }  // namespace velktest
 
-// The linker sends the calls here and the __real_ ones on (--wrap).
+// The linker sends the calls here and the __real_ ones on (--wrap). Visible, because sanitizers'
+// libraries refer to the same names.
 // NOLINTBEGIN(bugprone-reserved-identifier,readability-identifier-naming)
 extern "C" {
 
 int __real_closedir(DIR *directory);
 dirent64 *__real_readdir64(DIR *directory);
 
-int __wrap_closedir(DIR *directory) {
+[[gnu::visibility("default")]] int __wrap_closedir(DIR *directory) {
     const int result = __real_closedir(directory);
     auto *faults = velktest::faults;
     if (faults == nullptr || !std::exchange(faults->next_close_fails, false)) {
@@ -39,7 +40,7 @@ int __wrap_closedir(DIR *directory) {
     return -1;
 }
 
-dirent64 *__wrap_readdir64(DIR *directory) {
+[[gnu::visibility("default")]] dirent64 *__wrap_readdir64(DIR *directory) {
     dirent64 *entry = __real_readdir64(directory);
     const auto *faults = velktest::faults;
     if (entry != nullptr && faults != nullptr && faults->on_entry) {

@@ -37,10 +37,10 @@ std::string VelkhostTest::package(const std::string &name) {
     return "file://" + (packages() / (name + ".xml")).string();
 }
 
-std::vector<std::string> VelkhostTest::example_request() {
+std::vector<std::string> VelkhostTest::example_request(const std::string &list) {
     std::vector<std::string> uris;
-    std::ifstream list(VELK_EXAMPLES_DIR "/default.list");
-    for (std::string line; std::getline(list, line);) {
+    std::ifstream lines(VELK_EXAMPLES_DIR "/" + list + ".list");
+    for (std::string line; std::getline(lines, line);) {
         if (!line.empty() && line[0] != '#') {
             uris.push_back(package(fs::path(line).replace_extension().string()));
         }

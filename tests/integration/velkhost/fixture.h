@@ -24,7 +24,7 @@ class VelkhostTest : public ::testing::Test {
     std::string package(const std::string &name = kRxc);
 
     // The example request.
-    std::vector<std::string> example_request();
+    std::vector<std::string> example_request(const std::string &list);
 
     // A scenario whose controller never comes to an end.
     std::string endless_scenario();

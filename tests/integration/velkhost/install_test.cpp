@@ -42,6 +42,19 @@ TEST_F(VelkhostInstall, FinishedRunKeepsItsFolderAndNamesItsFiles) {
     EXPECT_TRUE(fs::exists(document["files"]["status_file"].get<std::string>()));
 }
 
+// The library prints what it trims off the names of adapters.
+TEST_F(VelkhostInstall, WhatTheLibraryPrintsIsKeptApart) {
+    const std::string name = "brcd_fw_fc_1860-3.2.1.0_anyos";
+    const Finished finished = velkhost(
+        {"install", "--scenario", std::string(kScenarios) + "default.toml", package(name)});
+    EXPECT_EQ(finished.exit_code, 0);
+    EXPECT_THAT(finished.out, Not(HasSubstr("trimString")));
+    ASSERT_EQ(run_folders().size(), 1U);
+    std::ifstream printed(run_folders()[0] / "var/log/broker-stdout.txt");
+    const std::string text{std::istreambuf_iterator<char>(printed), {}};
+    EXPECT_THAT(text, HasSubstr("trimString: trimmed to \"1860-2P\"\n"));
+}
+
 TEST_F(VelkhostInstall, DiscardLeavesNothing) {
     const Finished finished = velkhost({"install", "--discard", package()});
     EXPECT_EQ(finished.exit_code, 0);
@@ -61,7 +74,7 @@ TEST_F(VelkhostInstall, RootIsUsedAndKept) {
 }
 
 TEST_F(VelkhostInstall, RunsOfAScenarioAreTheSame) {
-    const auto uris = example_request();
+    const auto uris = example_request("default");
     std::vector<std::string> arguments = {"install", "--discard", "--scenario",
                                           std::string(kScenarios) + "default.toml"};
     arguments.insert(arguments.end(), uris.begin(), uris.end());
@@ -73,7 +86,7 @@ TEST_F(VelkhostInstall, RunsOfAScenarioAreTheSame) {
 }
 
 TEST_F(VelkhostInstall, PackagesAreInstalledInTheirOrder) {
-    const auto uris = example_request();
+    const auto uris = example_request("firmware");
     const auto document = velkhost_json({uris.begin(), uris.end()});
     std::vector<std::string> order;
     for (const auto &entry : document["history"]) {

@@ -29,6 +29,30 @@ TEST(RigStatusHistory, PackageThatALineNoLongerShowsHasNotChanged) {
     EXPECT_EQ(history.changes().size(), 2U);
 }
 
+TEST(RigStatusHistory, CutOfTheLastPackageIsNoChange) {
+    StatusHistory history;
+    history.add(1, kFile, "0|a: 0: x|b: 50: installed|");
+    for (const char *cut :
+         {"0|a: 0: x|b: 50: inst", "0|a: 0: x|b: 5", "0|a: 0: x|b", "0|a: 0: x|"}) {
+        history.add(2, kFile, cut);
+        EXPECT_EQ(history.changes().size(), 2U) << cut;
+    }
+    history.add(3, kFile, "0|a: 0: x|b: 50: installed|");
+    EXPECT_EQ(history.changes().size(), 2U);
+    EXPECT_EQ(history.entries().size(), 6U);
+}
+
+TEST(RigStatusHistory, CutPackageThatSaysSomethingElseHasChanged) {
+    StatusHistory history;
+    history.add(1, kFile, "0|a: 0: x|b: 0: waiting|");
+    history.add(2, kFile, "0|a: 0: x|b: 62: bu");
+    history.add(3, kFile, "0|a: 0: x|b: 62: busy|");
+    const auto changes = history.changes();
+    ASSERT_EQ(changes.size(), 4U);
+    EXPECT_EQ(changes[2].status, (PackageStatus{"b", 62, "bu"}));
+    EXPECT_EQ(changes[3].status, (PackageStatus{"b", 62, "busy"}));
+}
+
 TEST(RigStatusHistory, TextThatIsNoStatusLineIsLeftOut) {
     StatusHistory history;
     history.add(1, kFile, "");

@@ -44,7 +44,8 @@ IpmiCalls::~IpmiCalls() {
 // NOLINTBEGIN(bugprone-reserved-identifier,readability-identifier-naming)
 extern "C" int __real_ioctl(int fd, unsigned long code, ...);
 
-extern "C" int __wrap_ioctl(int fd, unsigned long code, ...) {
+// Visible, because sanitizers' libraries refer to the same name.
+extern "C" [[gnu::visibility("default")]] int __wrap_ioctl(int fd, unsigned long code, ...) {
     va_list arguments;
     va_start(arguments, code);
     void *const argument = va_arg(arguments, void *);
