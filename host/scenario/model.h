@@ -43,11 +43,11 @@ struct FileTransferSettings {
     std::optional<std::string> private_key;  // file of an SSH key without a passphrase
     // File of the SSH servers that the service trusts (sshd(8)); no value: it trusts none.
     std::optional<std::string> known_hosts;
-    std::uint32_t connect_seconds = 30;      // real time that a server has to let the service in
-    std::uint32_t stall_seconds = 60;        // for how long nothing may come
-    std::uint32_t bytes_per_second = 0;      // speed of the link by the host's clock; 0: endless
-    std::optional<std::uint32_t> capacity;   // bytes that the file store takes; no value: its disk
-    std::uint32_t at_once = 4;               // how many jobs transfer at the same time
+    std::uint32_t connect_seconds = 30;     // real time that a server has to let the service in
+    std::uint32_t stall_seconds = 60;       // for how long nothing may come
+    std::uint32_t bytes_per_second = 0;     // speed of the link by the host's clock; 0: endless
+    std::optional<std::uint32_t> capacity;  // bytes that the file store takes; no value: its disk
+    std::uint32_t at_once = 4;              // how many jobs transfer at the same time
 };
 
 // DMTF job states (CIM_ConcreteJob.JobState) that the services use.

@@ -9,6 +9,11 @@ namespace velkhost::providers {
 TransferLedger::TransferLedger(const std::vector<std::string> &paths)
     : paths_(paths.begin(), paths.end()) {}
 
+void TransferLedger::add(const std::string &path) {
+    const std::lock_guard lock(mutex_);
+    paths_.insert(path);
+}
+
 TransferLedger::Outcome TransferLedger::remove(const std::string &path) {
     const std::lock_guard lock(mutex_);
     const auto known = paths_.find(path);

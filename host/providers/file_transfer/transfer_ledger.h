@@ -14,6 +14,8 @@ class TransferLedger {
     // `paths` are absolute.
     explicit TransferLedger(const std::vector<std::string> &paths);
 
+    void add(const std::string &path);
+
     enum class Outcome { kDeleted, kNotTransferred, kFailed };
 
     // Deletes a file of the ledger and forgets it. kFailed leaves the file in the ledger, and errno

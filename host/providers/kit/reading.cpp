@@ -103,6 +103,11 @@ CMPIData Args::typed(const char *name, CMPIType type, const char *type_name) con
     return data;
 }
 
+bool Args::has(const char *name) const {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    return args_ != nullptr && is_usable(status, CMGetArg(args_, name, &status));
+}
+
 std::string Args::text(const char *name) const {
     const auto text = text_of(typed(name, CMPI_string, "string").value.string);
     if (!text) {
@@ -114,6 +119,10 @@ std::string Args::text(const char *name) const {
 
 std::uint8_t Args::uint8(const char *name) const {
     return typed(name, CMPI_uint8, "uint8").value.uint8;
+}
+
+std::uint16_t Args::uint16_or(const char *name, std::uint16_t otherwise) const {
+    return has(name) ? typed(name, CMPI_uint16, "uint16").value.uint16 : otherwise;
 }
 
 std::vector<std::uint16_t> Args::uint16s(const char *name) const {

@@ -50,10 +50,13 @@ class Args {
     // Throw CimError "invalid parameter" when the argument is absent, null or of another type.
     [[nodiscard]] std::string text(const char *name) const;
     [[nodiscard]] std::uint8_t uint8(const char *name) const;
+    // `otherwise` when the argument is absent or null.
+    [[nodiscard]] std::uint16_t uint16_or(const char *name, std::uint16_t otherwise) const;
     [[nodiscard]] std::vector<std::uint16_t> uint16s(const char *name) const;
     [[nodiscard]] Path reference(const char *name) const;
 
   private:
+    [[nodiscard]] bool has(const char *name) const;
     [[nodiscard]] CMPIData typed(const char *name, CMPIType type, const char *type_name) const;
 
     const CMPIArgs *args_;

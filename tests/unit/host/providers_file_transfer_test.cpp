@@ -78,12 +78,36 @@ TEST_F(FileTransferProvider, DeleteWithoutAFileIsAnInvalidParameter) {
     EXPECT_EQ(call("DeleteTransferredFile").status.code, CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-TEST_F(FileTransferProvider, TransfersAreNotSupported) {
+// What is no location of the method's kind is answered without a look at the file store.
+TEST_F(FileTransferProvider, LocationOfAnotherKindIsAnInvalidParameter) {
+    for (const char *uri : {"", "x", "sftp://host/a.xml", "file:///etc/passwd", "tftp://host/"}) {
+        const auto reply = call("TransferViaTFTP", {{"SourceURI", Value::string(uri)}});
+        EXPECT_EQ(reply.return_value, Value::uint32(3)) << uri;
+        EXPECT_EQ(text(reply.out, "DestinationURI"), "") << uri;
+    }
+    for (const char *uri : {"", "ftp://host/a.zip", "file:///etc/passwd", "sftp:///a.xml"}) {
+        const auto reply = call("TransferViaURL", {{"SourceURI", Value::string(uri)}});
+        EXPECT_EQ(reply.return_value, Value::uint32(3)) << uri;
+        EXPECT_EQ(text(reply.out, "DestinationURI"), "") << uri;
+        EXPECT_EQ(reply.out.find("Job"), nullptr) << uri;
+    }
+}
+
+TEST_F(FileTransferProvider, BlockSizeThatTftpDoesNotKnowIsAnInvalidParameter) {
+    for (const std::uint16_t size : {0, 7, 65465, 65535}) {
+        const auto reply =
+            call("TransferViaTFTP", {{"SourceURI", Value::string("tftp://host/a.xml")},
+                                     {"BlockSize", Value::uint16(size)}});
+        EXPECT_EQ(reply.return_value, Value::uint32(3)) << size;
+    }
+    const auto reply = call("TransferViaTFTP", {{"SourceURI", Value::string("tftp://host/a.xml")},
+                                                {"BlockSize", Value::string("many")}});
+    EXPECT_EQ(reply.status.code, CMPI_RC_ERR_INVALID_PARAMETER);
+}
+
+TEST_F(FileTransferProvider, TransferWithoutASourceIsAnInvalidParameter) {
     for (const char *method : {"TransferViaTFTP", "TransferViaURL"}) {
-        const auto reply = call(method, {{"SourceURI", Value::string("tftp://host/a.xml")}});
-        EXPECT_EQ(reply.status.code, CMPI_RC_ERR_NOT_SUPPORTED) << method;
-        EXPECT_EQ(reply.status.message,
-                  "This host's file transfer service does not fetch files: tftp://host/a.xml");
+        EXPECT_EQ(call(method).status.code, CMPI_RC_ERR_INVALID_PARAMETER) << method;
     }
 }
 
