@@ -79,40 +79,13 @@ CMPIStatus set_property_filter(CMPIInstance *instance, const char **properties, 
 
 // -- The path --
 
-// The key's value: the property's if it has one, else what the path was made with.
-const cim::Value *key_value(const cim::Instance &instance, std::string_view name) {
-    const cim::Value *property = instance.properties.find(name);
-    const bool usable = property != nullptr && !property->is_null();
-    return usable ? property : instance.path.keys.find(name);
-}
-
-// No value when nothing is known as a key.
-std::optional<cim::ObjectPath> path_of(const Core &core, const cim::Instance &instance) {
-    const auto declared = core.repository.find_class(instance.path);
-    if (declared == nullptr && instance.path.keys.empty()) {
-        return std::nullopt;
-    }
-    auto names = declared != nullptr ? declared->key_names() : std::vector<std::string>();
-    for (const cim::NamedValue &key : instance.path.keys) {
-        names.push_back(key.name);
-    }
-    cim::ObjectPath path{
-        instance.path.host, instance.path.name_space, instance.path.class_name, {}};
-    for (const std::string &name : names) {
-        if (const cim::Value *value = key_value(instance, name)) {
-            path.keys.set(name, *value);
-        }
-    }
-    return path;
-}
-
 CMPIObjectPath *get_object_path(const CMPIInstance *instance, CMPIStatus *status) {
     const auto *object = open(instance, "getObjectPath", status);
     if (object == nullptr) {
         return nullptr;
     }
     const cim::Instance &content = object->payload->instance;
-    std::optional<cim::ObjectPath> path = path_of(object->tag.core, content);
+    std::optional<cim::ObjectPath> path = object->tag.core.repository.path_of(content);
     if (!path) {
         set_status(status, CMPI_RC_ERR_INVALID_CLASS);
         return nullptr;

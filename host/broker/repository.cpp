@@ -40,7 +40,7 @@ Members merged(Members inherited, const Members &own) {
 }
 
 MergedClass merged_class(const cim::ClassDecl &own, const MergedClass *superclass) {
-    MergedClass result{own, {}};
+    MergedClass result{own, {}, own};
     if (superclass != nullptr) {
         const cim::ClassDecl &inherited = superclass->declaration;
         result.declaration.properties = merged(inherited.properties, own.properties);
@@ -66,6 +66,13 @@ cim::Value initial_value(const cim::PropertyDecl &property) {
         return cim::Value::array(element_type, std::move(elements));
     }
     return elements.empty() ? cim::Value::null(type) : elements.front();
+}
+
+// The key's value: the property's if it has one, else what the path was made with.
+const cim::Value *key_value(const cim::Instance &instance, std::string_view name) {
+    const cim::Value *property = instance.properties.find(name);
+    const bool usable = property != nullptr && !property->is_null();
+    return usable ? property : instance.path.keys.find(name);
 }
 
 }  // namespace
@@ -177,6 +184,25 @@ cim::Instance Repository::new_instance(const cim::ObjectPath &path) const {
         instance.properties.set(key.name, key.value);
     }
     return instance;
+}
+
+std::optional<cim::ObjectPath> Repository::path_of(const cim::Instance &instance) const {
+    const ClassPointer declared = find_class(instance.path);
+    if (declared == nullptr && instance.path.keys.empty()) {
+        return std::nullopt;
+    }
+    auto names = declared != nullptr ? declared->key_names() : std::vector<std::string>();
+    for (const cim::NamedValue &key : instance.path.keys) {
+        names.push_back(key.name);
+    }
+    cim::ObjectPath path{
+        instance.path.host, instance.path.name_space, instance.path.class_name, {}};
+    for (const std::string &name : names) {
+        if (const cim::Value *value = key_value(instance, name)) {
+            path.keys.set(name, *value);
+        }
+    }
+    return path;
 }
 
 std::optional<cim::Value> Repository::property_qualifier(const cim::ObjectPath &path,

@@ -22,6 +22,7 @@ namespace velkhost::broker {
 struct VELKBROKER_API MergedClass {
     cim::ClassDecl declaration;
     std::vector<std::string> ancestors;  // nearest first
+    cim::ClassDecl own;                  // without what it inherits
 
     [[nodiscard]] const cim::PropertyDecl *find_property(std::string_view name) const;
     [[nodiscard]] const cim::MethodDecl *find_method(std::string_view name) const;
@@ -60,6 +61,10 @@ class VELKBROKER_API Repository {
     // An instance of the class in the path: its properties null or as the class initialises them,
     // the path's keys as properties. An unknown class gives the keys alone.
     [[nodiscard]] cim::Instance new_instance(const cim::ObjectPath &path) const;
+
+    // The path that names the instance: that of its making, with its key properties as keys. No
+    // value when nothing is known as a key.
+    [[nodiscard]] std::optional<cim::ObjectPath> path_of(const cim::Instance &instance) const;
 
     // The qualifier's value, a string or an array of strings, or true for a bare one.
     [[nodiscard]] std::optional<cim::Value> property_qualifier(const cim::ObjectPath &path,

@@ -16,6 +16,8 @@ namespace velkhost::cim {
 struct Qualifier {
     std::string name;
     std::vector<std::string> values;
+    // As the qualifier is declared, with CMPI_ARRAY for arrays; CMPI_null: it is not declared.
+    CMPIType type = CMPI_null;
 };
 
 // A declared type: `type` is a CMPI type code with CMPI_ARRAY set for arrays; `reference_class`

@@ -147,7 +147,9 @@ QualifierUse read_qualifier(TokenStream &in, const Unit &unit, NameTable &seen) 
     declare_new(seen, name, "qualifier of this list", in);
     const auto parameter = read_parameter(in);
     QualifierUse use{{std::string{name.spelling}, {}}, name.position};
-    use.qualifier.values = values_of(parameter, unit.find_qualifier(name.spelling), in);
+    const QualifierDecl *const declared = unit.find_qualifier(name.spelling);
+    use.qualifier.values = values_of(parameter, declared, in);
+    use.qualifier.type = declared != nullptr ? declared->type : CMPI_null;
     skip_flavors(in);
     return use;
 }
