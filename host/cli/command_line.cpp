@@ -2,6 +2,8 @@
 
 #include "host/cli/install_command.h"
 #include "host/cli/report.h"
+#include "host/cli/serve_arguments.h"
+#include "host/cli/serve_command.h"
 
 #include <fmt/format.h>
 #include <CLI/CLI.hpp>
@@ -40,7 +42,7 @@ class CommandLine {
     CommandLine() {
         app_.require_subcommand(1);
         app_.set_version_flag("--version", "velkhost " VELKHOST_VERSION);
-        app_.footer("`velkhost install --help` tells the rest.");
+        app_.footer("`velkhost COMMAND --help` tells the rest.");
         app_.add_subcommand("help", "Show this help");
         add_install();
     }
@@ -51,6 +53,8 @@ class CommandLine {
     void add_install();
     InstallOptions install_options();
 
+    int run_parsed();
+
     CLI::App app_{"A stand-in host for libvelkprovider.so: runs installation requests on it."};
     CLI::App *install_ = nullptr;
     CLI::Option *options_ = nullptr;
@@ -59,6 +63,7 @@ class CommandLine {
     CLI::Option *scenario_ = nullptr;
     Raw raw_;
     InstallOptions parsed_;
+    ServeArguments serve_{app_};
 };
 
 void CommandLine::add_install() {
@@ -112,23 +117,29 @@ InstallOptions CommandLine::install_options() {
     return result;
 }
 
+int CommandLine::run_parsed() {
+    if (serve_.parsed()) {
+        return run_serve(serve_.options());
+    }
+    if (!install_->parsed()) {
+        fmt::print("{}", app_.help());
+        return 0;
+    }
+    const InstallOptions options = install_options();
+    Interrupt interrupt;
+    return run_install(options, interrupt);
+}
+
 int CommandLine::run(int argc, char **argv) {
-    InstallOptions options;
     try {
         app_.parse(argc, argv);
-        if (!install_->parsed()) {
-            fmt::print("{}", app_.help());
-            return 0;
-        }
-        options = install_options();
+        return run_parsed();
     } catch (const CLI::ParseError &error) {
         return app_.exit(error) == 0 ? 0 : kUsage;
     } catch (const UsageError &error) {
         fmt::print(stderr, "velkhost: {}\n", error.what());
         return kUsage;
     }
-    Interrupt interrupt;
-    return run_install(options, interrupt);
 }
 
 }  // namespace

@@ -16,9 +16,6 @@ namespace {
 
 constexpr std::int64_t kMicrosPerSecond = 1'000'000;
 
-// Where such a host's init system puts what its broker and the providers print.
-constexpr const char *kBrokerOutput = "/var/log/broker-stdout.txt";
-
 // The machine's own time, whatever the host's clock shows: not through libc.
 double real_seconds() {
     timespec now{};

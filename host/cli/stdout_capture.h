@@ -6,6 +6,9 @@
 
 namespace velkhost::cli {
 
+// Where such a host's init system puts what its broker and the providers print.
+inline constexpr const char *kBrokerOutput = "/var/log/broker-stdout.txt";
+
 // The process's stdout as it was, for the command alone.
 class OwnStdout {
   public:
