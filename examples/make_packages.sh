@@ -12,6 +12,8 @@ examples=$(cd -- "$(dirname -- "${BASH_SOURCE[0]}")" && pwd)
 source_folder=$examples/packages
 # shellcheck source=examples/zip_writer.sh
 source "$examples/zip_writer.sh"
+# shellcheck source=examples/depot_writer.sh
+source "$examples/depot_writer.sh"
 
 readonly adapter_image_size=16384
 
@@ -89,6 +91,20 @@ payload() {
   mv -f -- "$file.new" "$file"
 }
 
+# depot SOURCE FOLDER CHECKSUM: a bundle of the hypervisor's updates, with that checksum of its
+# metadata.
+depot() {
+  local source=$1 folder=$2 vib file
+  mkdir -p -- "$folder"
+  cp -f -- "$source/index.xml" "$source/vendor-index.xml" "$folder/"
+  payload "$folder/metadata.zip" "$3" depot_metadata "$source"
+  for vib in "$source"/vibs/*.xml; do
+    file=$folder/$(depot_text "$vib" relative-path)
+    mkdir -p -- "${file%/*}"
+    payload "$file" '' depot_vib "$vib"
+  done
+}
+
 # package NAME FOLDER
 package() {
   local descriptor=$source_folder/$1.xml folder=$2 file version sum
@@ -96,7 +112,9 @@ package() {
   file=$(property "$descriptor" payload)
   version=$(property "$descriptor" version)
   sum=$(property "$descriptor" payloadChecksum)
-  if [[ $file == *.zip ]]; then
+  if [[ $file == */ ]]; then
+    depot "$source_folder/$1" "$folder/${file%/}" "$sum"
+  elif [[ $file == *.zip ]]; then
     payload "$folder/$file" "$sum" adapter_archive "$source_folder/$1/payload.xml" "$version"
   else
     payload "$folder/$file" "$sum" image "$(property "$descriptor" identificationCode)" \

@@ -22,7 +22,8 @@ constexpr std::array kFolders = {
 // What the host's broker finds in /usr/lib/cim: the library, what it loads, the other providers.
 bool is_host_library(const fs::path &file) {
     const std::string name = file.filename().string();
-    const bool is_provider = name.starts_with("libzeb") || name.starts_with("libadapter");
+    const bool is_provider = name.starts_with("libzeb") || name.starts_with("libadapter") ||
+                             name.starts_with("libhypervisor");
     return name == "libvelkprovider.so" || name == "libconcretejob.so" ||
            name == "libunzipfile.so" || (is_provider && name.ends_with(".so"));
 }

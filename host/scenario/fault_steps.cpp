@@ -34,6 +34,7 @@ constexpr std::array kFamilies{
     Family{"brocade.",      Rest::kName,    CodeKind::kCimStatus},
     Family{"broadcom.",     Rest::kName,    CodeKind::kCimStatus},
     Family{"lsi.",          Rest::kName,    CodeKind::kCimStatus},
+    Family{"hypervisor.",   Rest::kName,    CodeKind::kCimStatus},
     Family{"bmc.",          Rest::kName,    CodeKind::kController},
 };
 // clang-format on

@@ -94,6 +94,15 @@ struct ServiceAnswer {
     std::optional<std::vector<JobLook>> job;
 };
 
+// [hypervisor]: the hypervisor's own installation service, for bundles of its updates.
+struct HypervisorSettings {
+    // The systems that have such a service, in the order of an enumeration; no value: the host.
+    std::optional<std::vector<std::string>> systems;
+    std::vector<std::string> installed;     // packages (VIBs) that are there: "NAME VERSION"
+    std::vector<std::string> earlier_jobs;  // JobStatus of jobs that ended before the run began
+    std::vector<ServiceAnswer> answers;     // of every system's service
+};
+
 // Families of adapters, each with a provider of its own; scenario/adapter_family.h has their names.
 enum class AdapterFamily : std::size_t {
     kEmulexFc,
@@ -176,6 +185,7 @@ struct Description {
     JobSettings jobs;
     ControllerSettings controller;
     std::vector<ServiceAnswer> management_controller;
+    HypervisorSettings hypervisor;
     std::vector<Adapter> adapters;
     AdapterAnswers adapter_answers;
     FileTransferSettings file_transfer;

@@ -3,6 +3,7 @@
 #include "host/scenario/adapter_reader.h"
 #include "host/scenario/controller_reader.h"
 #include "host/scenario/fault_steps.h"
+#include "host/scenario/hypervisor_reader.h"
 #include "host/scenario/read_file.h"
 #include "host/scenario/service_reader.h"
 #include "host/scenario/table_reader.h"
@@ -136,6 +137,9 @@ Description parse_description(std::string_view text, const std::string &source) 
     }
     if (auto table = in.table("management_controller")) {
         out.management_controller = read_service(*std::move(table), ServiceKind::kJob);
+    }
+    if (auto table = in.table("hypervisor")) {
+        out.hypervisor = read_hypervisor(*std::move(table));
     }
     read_adapters(in, out);
     if (auto table = in.table("file_transfer")) {

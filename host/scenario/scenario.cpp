@@ -20,8 +20,10 @@ Scenario::Scenario(Description description)
       jobs(description.jobs),
       controller(std::move(description.controller)),
       file_transfer(std::move(description.file_transfer)),
+      hypervisor(std::move(description.hypervisor)),
       adapters(std::move(description.adapters)),
       management_controller(std::move(description.management_controller)),
+      hypervisor_service(hypervisor.answers),
       faults(std::move(description.faults)) {
     for (const FamilyTraits &traits : kFamilyTraits) {
         const auto index = static_cast<std::size_t>(traits.family);

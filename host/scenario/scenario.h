@@ -36,8 +36,10 @@ class VELKSCENARIO_API Scenario {
     const JobSettings jobs;
     const ControllerSettings controller;
     const FileTransferSettings file_transfer;
+    const HypervisorSettings hypervisor;
     const std::vector<Adapter> adapters;
     AnswerBook management_controller;
+    AnswerBook hypervisor_service;
     FaultRules faults;
 
     // The answers of a family's service.

@@ -43,6 +43,15 @@ std::optional<JobView> JobTable::take_look(const std::string &id) {
     return JobView{job->id, job->request, job->looks.take()};
 }
 
+std::vector<JobView> JobTable::take_all() {
+    const std::lock_guard lock(mutex_);
+    std::vector<JobView> views;
+    for (Job &job : jobs_) {
+        views.push_back({job.id, job.request, job.looks.take()});
+    }
+    return views;
+}
+
 std::vector<JobView> JobTable::peek_all() const {
     const std::lock_guard lock(mutex_);
     std::vector<JobView> views;

@@ -39,6 +39,8 @@ class JobTable {
     std::optional<JobRequest> request_of(const std::string &id) const;
     // One read of the job, which uses up one look.
     std::optional<JobView> take_look(const std::string &id);
+    // One read of every job, in the order in which they were started.
+    std::vector<JobView> take_all();
     // All jobs as their next read will find them; uses up nothing.
     std::vector<JobView> peek_all() const;
 

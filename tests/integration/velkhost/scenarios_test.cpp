@@ -17,6 +17,8 @@ constexpr const char *kFirmware = "firmware";
 constexpr const char *kAdapters = "adapters";
 // Seven adapters, then rxc2, uefi 1.50, uefi 1.60, rxc of node 2, diag, rxc, fpga.
 constexpr const char *kDefault = "default";
+// RXC, the bundle, diag, the same bundle.
+constexpr const char *kHypervisor = "hypervisor";
 
 struct Row {
     const char *scenario;
@@ -40,6 +42,8 @@ const std::vector<Row> kRows = {
     {"controller-no-ping",     kFirmware, 1, 10, 210, {53, 53, 53, 53, 53, 53, 53}},
     {"controller-unknown-text", kFirmware, 1, 10, 140, {57, 57, 57, 57, 57, 57, 57}},
     {"default",                kDefault,  1,  7, 841.4, {50, 50, 50, 50, 50, 50, 50, 50, 50, 50, 53, 50, 50, 50}},
+    {"hypervisor",             kHypervisor, 0, 7, 200, {50, 59, 50, 50}},
+    {"hypervisor-fails",       kHypervisor, 1, 7, 170, {50, 57, 50, 56}},
     {"job-library-lost",       kFirmware, 3, kNone, 60, {}},
     {"job-library-recovers",   kFirmware, 0,  7, 514, {50, 50, 50, 50, 50, 50, 50}},
     {"no-job-reference",       kFirmware, 1, 10, 210, {57, 57, 57, 57, 57, 57, 57}},
