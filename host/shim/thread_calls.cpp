@@ -26,8 +26,7 @@ void *run_thread(void *birth_of_thread) {
     Birth &birth = *static_cast<Birth *>(birth_of_thread);
     const ThreadBody body = birth.body;
     void *const argument = birth.argument;
-    virtual_clock.adopt(birth.token);
-    birth.taken_over.set();
+    virtual_clock.adopt(birth.token, birth.taken_over);
     return body(argument);
 }
 

@@ -204,13 +204,25 @@ void VirtualClock::cancel_child(Token token) {
     }
 }
 
-void VirtualClock::adopt(Token token) {
+void VirtualClock::adopt(Token token, Signal &adopted) {
     self() = Self{token, 0};
     if (token != 0) {
         watch_thread_end();
     }
-    const std::lock_guard lock(mutex_);
-    static_cast<void>(forget_ended(pthread_self()));  // the number of an earlier thread
+    Sleeper sleeper;
+    {
+        const std::lock_guard lock(mutex_);
+        static_cast<void>(forget_ended(pthread_self()));  // the number of an earlier thread
+        if (takes_part()) {
+            sleeper.wake_us = now_us();
+            insert(sleeper);
+            suspend_one();
+        } else {
+            sleeper.woken.set();
+        }
+    }
+    adopted.set();
+    sleeper.woken.wait();
 }
 
 void VirtualClock::thread_ends() {

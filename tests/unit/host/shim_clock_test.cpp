@@ -9,6 +9,8 @@
 #include <cerrno>
 #include <chrono>
 #include <limits>
+#include <mutex>
+#include <string>
 #include <thread>
 #include <vector>
 
@@ -187,6 +189,33 @@ TEST_F(ShimClock, ClockCanBeStartedAgainFromAnotherTime) {
     EXPECT_EQ(time(nullptr), 43);
 }
 
+// What comes at the same time is no matter of chance: one thread goes on after the other.
+TEST_F(ShimClock, ThreadsBeginInTheOrderOfTheirMakingWhenTheirMakerPauses) {
+    const TakePart taking_part;
+    std::mutex mutex;
+    std::string order;
+    const auto note = [&](char name) {
+        const std::lock_guard lock(mutex);
+        order += name;
+    };
+    std::vector<std::thread> threads;
+    for (const char name : {'a', 'b', 'c', 'd'}) {
+        threads.emplace_back([&note, name] {
+            note(name);
+            sleep(10);
+            note(name);
+        });
+    }
+    note('0');
+    sleep(10);
+    note('1');
+    for (std::thread &thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(order, "0abcd1abcd");
+    EXPECT_EQ(elapsed(), 10 * kSecond);
+}
+
 // A thread pauses for an hour while the test's own thread takes part and runs, so that no time can
 // pass; signals arrive until the pause has ended.
 class ShimSignals : public ShimClock {
@@ -205,6 +234,7 @@ class ShimSignals : public ShimClock {
         const TakePart taking_part;
         pthread_t thread{};
         ASSERT_EQ(pthread_create(&thread, nullptr, pausing, nullptr), 0);
+        usleep(0);  // the thread's turn: until its pause
         while (!ended) {
             pthread_kill(thread, SIGUSR1);
             std::this_thread::yield();
