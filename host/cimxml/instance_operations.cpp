@@ -12,6 +12,11 @@
 namespace velkhost::cimxml {
 namespace {
 
+cim::ObjectPath class_path(const Call &call, const Parameters &in) {
+    static_cast<void>(in.require("ClassName"));
+    return {{}, call.name_space(), in.class_name("ClassName"), {}};
+}
+
 // Without DeepInheritance, subclasses are shown as the class that was asked for.
 void leave_out_subclass_properties(InstanceForm &form, broker::ClassPointer asked) {
     auto wanted = std::move(form.wanted);
@@ -60,7 +65,7 @@ void enumerate_instances(const Call &call) {
     const Parameters in(call.request.call,
                         {"ClassName", "LocalOnly", "DeepInheritance", "IncludeQualifiers",
                          "IncludeClassOrigin", "PropertyList"});
-    const cim::ObjectPath path = call.reader().class_name(in.require("ClassName"));
+    const cim::ObjectPath path = class_path(call, in);
     const bool deep = in.flag("DeepInheritance", true);
     const CMPIFlags flags =
         (deep ? CMPI_FLAG_DeepInheritance : 0U) |
@@ -81,8 +86,7 @@ void enumerate_instances(const Call &call) {
 
 void enumerate_instance_names(const Call &call) {
     const Parameters in(call.request.call, {"ClassName"});
-    const auto reply = call.broker.enumerate_instance_names(
-        call.reader().class_name(in.require("ClassName")), call.options());
+    const auto reply = call.broker.enumerate_instance_names(class_path(call, in), call.options());
     check(reply.status);
     for (const cim::ObjectPath &path : reply.paths) {
         write_instance_name(call.out, path);

@@ -61,6 +61,9 @@ CMPIType element_type(const XmlElement &parameter, CMPIType declared) {
 // -- Paths --
 
 cim::ObjectPath ValueReader::class_name(const XmlElement &element) const {
+    if (element.name != "CLASSNAME") {
+        fail_not_valid("a CLASSNAME was expected, not " + element.name);
+    }
     return {{}, name_space_, required_attribute(element, "NAME"), {}};
 }
 
