@@ -22,14 +22,19 @@ target_precompile_headers(velk_test_headers PRIVATE
   <algorithm> <array> <atomic> <filesystem> <fstream> <map> <thread>)
 target_compile_options(velk_test_headers PRIVATE $<$<CONFIG:Release>:-O0>)
 
-# velk_add_tests(NAME SOURCES... [LIBS ...] [LABEL ...])
-# Each TEST becomes a ctest case of its own and so runs in a process of its own.
+# velk_add_tests(NAME SOURCES... [LIBS ...] [LABEL ...] [ONE_THREAD])
+# Each TEST becomes a ctest case of its own and so runs in a process of its own. What never has
+# more than ONE_THREAD is of no interest to the thread sanitizer, whose build leaves it out.
 function(velk_add_tests name)
-  cmake_parse_arguments(ARG "" "LABEL" "SOURCES;LIBS" ${ARGN})
+  cmake_parse_arguments(ARG "ONE_THREAD" "LABEL" "SOURCES;LIBS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
   target_link_libraries(${name} PRIVATE velk_options ${ARG_LIBS} gmock_main)
   target_precompile_headers(${name} REUSE_FROM velk_test_headers)
   target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
+  if(ARG_ONE_THREAD AND VELK_SANITIZE STREQUAL "thread")
+    set_target_properties(${name} PROPERTIES EXCLUDE_FROM_ALL ON)
+    return()
+  endif()
   # A parameter's value would bring addresses into the names.
   gtest_discover_tests(${name} TEST_PREFIX "${ARG_LABEL}." NO_PRETTY_VALUES DISCOVERY_TIMEOUT 120
     PROPERTIES LABELS "${ARG_LABEL}" TIMEOUT 120)

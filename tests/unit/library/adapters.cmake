@@ -1,6 +1,6 @@
 # What adapter packages take: the payloads that apply to an adapter, and the families' installers
 # against doubles of their vendors' providers.
-velk_add_tests(library_applicability_tests LABEL unit.library
+velk_add_tests(library_applicability_tests LABEL unit.library ONE_THREAD
   SOURCES
     applicability_lines_test.cpp
     applicability_order_test.cpp
