@@ -30,7 +30,8 @@ target_link_options(velk_options INTERFACE -Wl,-z,relro,-z,now)
 add_library(velk_sanitizers INTERFACE)
 if(VELK_SANITIZE)
   target_compile_options(velk_sanitizers INTERFACE
-    -fsanitize=${VELK_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+    -fsanitize=${VELK_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all
+    $<$<BOOL:$<TARGET_PROPERTY:VELK_UNDEFINED_UNCHECKED>>:-fno-sanitize=undefined>)
   target_link_options(velk_sanitizers INTERFACE -fsanitize=${VELK_SANITIZE})
 endif()
 target_link_libraries(velk_options INTERFACE velk_sanitizers)

@@ -11,16 +11,22 @@ endforeach()
 
 include(GoogleTest)
 
-# The headers that most tests take, read once for all test programs: a test's time in the compiler
-# goes to GoogleTest's headers and to the optimiser.
+# How tests are compiled other than what they test: the optimiser, and checks for undefined
+# behaviour in GoogleTest's many instantiations, would take most of a build's time.
+function(velk_compile_as_test name)
+  target_link_libraries(${name} PRIVATE velk_options gmock_main)
+  target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
+  set_target_properties(${name} PROPERTIES VELK_UNDEFINED_UNCHECKED ON)
+endfunction()
+
+# The headers that most tests take, read once for all test programs.
 file(CONFIGURE OUTPUT ${CMAKE_BINARY_DIR}/test_headers.cpp CONTENT "")
 # A program, because it is compiled as those that take the headers from it.
 add_executable(velk_test_headers EXCLUDE_FROM_ALL ${CMAKE_BINARY_DIR}/test_headers.cpp)
-target_link_libraries(velk_test_headers PRIVATE velk_options gmock_main)
+velk_compile_as_test(velk_test_headers)
 target_precompile_headers(velk_test_headers PRIVATE
   <gmock/gmock.h> <gtest/gtest.h>
   <algorithm> <array> <atomic> <filesystem> <fstream> <map> <thread>)
-target_compile_options(velk_test_headers PRIVATE $<$<CONFIG:Release>:-O0>)
 
 # velk_add_tests(NAME SOURCES... [LIBS ...] [LABEL ...] [ONE_THREAD])
 # Each TEST becomes a ctest case of its own and so runs in a process of its own. What never has
@@ -28,9 +34,9 @@ target_compile_options(velk_test_headers PRIVATE $<$<CONFIG:Release>:-O0>)
 function(velk_add_tests name)
   cmake_parse_arguments(ARG "ONE_THREAD" "LABEL" "SOURCES;LIBS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
-  target_link_libraries(${name} PRIVATE velk_options ${ARG_LIBS} gmock_main)
+  target_link_libraries(${name} PRIVATE ${ARG_LIBS})
+  velk_compile_as_test(${name})
   target_precompile_headers(${name} REUSE_FROM velk_test_headers)
-  target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
   if(ARG_ONE_THREAD AND VELK_SANITIZE STREQUAL "thread")
     set_target_properties(${name} PROPERTIES EXCLUDE_FROM_ALL ON)
     return()

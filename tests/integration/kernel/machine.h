@@ -15,7 +15,7 @@ enum class Abi { k64, k32 };
 
 // Its name in the tests' own: "lp64", "ilp32".
 const char *name_of(Abi abi);
-void PrintTo(Abi abi, std::ostream *out);  // NOLINT(readability-identifier-naming): GoogleTest's
+void PrintTo(Abi abi, std::ostream *out);
 
 struct Setup {
     Abi abi = Abi::k64;

@@ -83,8 +83,7 @@ TEST_P(VelkhostScenario, EndsAsItSays) {
     }
 }
 
-// How messages show a row; a name that the test framework looks for.
-// NOLINTNEXTLINE(readability-identifier-naming)
+// How messages show a row.
 void PrintTo(const Row &row, std::ostream *out) {
     *out << row.scenario;
 }

@@ -93,9 +93,9 @@ class BrokerTest : public ::testing::Test {
   protected:
     BrokerTest() {
         add_test_classes(broker.repository());
-        context_provider.invoke = [this](const CMPIContext *context, const auto *, const auto *,
+        context_provider_.invoke = [this](const CMPIContext *context, const auto *, const auto *,
                                          const char *, const CMPIArgs *, CMPIArgs *) {
-            body(context);
+            body_(context);
             return CMPIStatus{CMPI_RC_OK, nullptr};
         };
     }
@@ -107,10 +107,10 @@ class BrokerTest : public ::testing::Test {
 
     // Runs `work` as a provider's method, with the context of a request.
     void in_request(std::function<void(const CMPIContext *)> work) {
-        body = std::move(work);
-        if (!registered) {
-            broker.register_provider(kNamespace, "Test_Runner", context_provider.methods());
-            registered = true;
+        body_ = std::move(work);
+        if (!registered_) {
+            broker.register_provider(kNamespace, "Test_Runner", context_provider_.methods());
+            registered_ = true;
         }
         EXPECT_EQ(broker.invoke_method(path_of("Test_Runner"), "Body").status, Status{});
     }
@@ -145,9 +145,9 @@ class BrokerTest : public ::testing::Test {
     std::string expected_findings;
 
   private:
-    ScriptedProvider context_provider;
-    std::function<void(const CMPIContext *)> body;
-    bool registered = false;
+    ScriptedProvider context_provider_;
+    std::function<void(const CMPIContext *)> body_;
+    bool registered_ = false;
 };
 
 }  // namespace velkhost::broker::testing
