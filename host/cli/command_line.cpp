@@ -1,6 +1,8 @@
 #include "host/cli/command_line.h"
 
 #include "host/cli/install_command.h"
+#include "host/cli/network_arguments.h"
+#include "host/cli/network_command.h"
 #include "host/cli/report.h"
 #include "host/cli/serve_arguments.h"
 #include "host/cli/serve_command.h"
@@ -64,6 +66,7 @@ class CommandLine {
     Raw raw_;
     InstallOptions parsed_;
     ServeArguments serve_{app_};
+    NetworkArguments network_{app_};
 };
 
 void CommandLine::add_install() {
@@ -120,6 +123,10 @@ InstallOptions CommandLine::install_options() {
 int CommandLine::run_parsed() {
     if (serve_.parsed()) {
         return run_serve(serve_.options());
+    }
+    if (network_.parsed()) {
+        Interrupt interrupt;
+        return run_network(network_.options(), interrupt);
     }
     if (!install_->parsed()) {
         fmt::print("{}", app_.help());

@@ -13,7 +13,7 @@ namespace velkhost::rig {
 
 ShimSession::ShimSession(const std::filesystem::path &root, scenario::Scenario &scenario,
                          bool virtual_clock, StatusHistory &history)
-    : root_(root), scenario_(scenario), history_(history) {
+    : root_(root), scenario_(scenario), history_(history), network_(root, scenario.network) {
     if (const int error = velkshim_set_root(root.c_str()); error != 0) {
         throw RigError("cannot use " + root.string() + " as the host's root: " + strerror(error));
     }
@@ -26,11 +26,13 @@ ShimSession::ShimSession(const std::filesystem::path &root, scenario::Scenario &
     }
     velkshim_set_fault_hook(&ShimSession::strike, this);
     velkshim_observe_files(&ShimSession::note_file, this);
+    network_.begin();
 }
 
 ShimSession::~ShimSession() {
     velkshim_observe_files(nullptr, nullptr);
     velkshim_set_fault_hook(nullptr, nullptr);
+    network_.stop();
     velkshim_thread_leave();
     velkshim_use_real_clock();
     velkshim_set_node_name(nullptr);
@@ -48,6 +50,9 @@ void ShimSession::note_file(void *session, const char *path, std::int64_t now_us
     auto &self = *static_cast<ShimSession *>(session);
     if (path == kLog) {
         self.last_log_us_.store(now_us);
+    }
+    if (path == NetworkComponent::kFlag) {
+        self.network_.notice_flag();
     }
     if (!std::string_view(path).starts_with(kStatusFile)) {
         return;

@@ -1,6 +1,8 @@
-// The process's libc calls as this host's: its root, clock, node name, faults and file observer.
+// The process's libc calls as this host's: its root, clock, node name, faults and file observer,
+// and with the observer the host's network component.
 #pragma once
 
+#include "host/rig/network_component.h"
 #include "host/rig/status_history.h"
 #include "host/scenario/scenario.h"
 
@@ -33,6 +35,7 @@ class ShimSession {
     scenario::Scenario &scenario_;
     StatusHistory &history_;
     std::atomic<std::int64_t> last_log_us_{0};
+    NetworkComponent network_;
 };
 
 // Time of the host's clock, microseconds since 1970-01-01 UTC.

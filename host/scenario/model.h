@@ -103,6 +103,20 @@ struct HypervisorSettings {
     std::vector<ServiceAnswer> answers;     // of every system's service
 };
 
+// A node of the host, with its management controller.
+struct NetworkNode {
+    std::string device;      // its IPMI device
+    std::string hypervisor;  // addresses in the in-band network
+    std::string controller;
+};
+
+// [network]: the in-band network of the host's nodes, and the component that configures it.
+struct NetworkSettings {
+    std::vector<NetworkNode> nodes;  // in the order of their numbers; none: there is no mapping
+    std::uint32_t age_seconds = 0;   // of the mapping when the run begins
+    std::optional<std::uint32_t> configure_seconds = 12;  // how long that takes; no value: for ever
+};
+
 // Families of adapters, each with a provider of its own; scenario/adapter_family.h has their names.
 enum class AdapterFamily : std::size_t {
     kEmulexFc,
@@ -186,6 +200,7 @@ struct Description {
     ControllerSettings controller;
     std::vector<ServiceAnswer> management_controller;
     HypervisorSettings hypervisor;
+    NetworkSettings network;
     std::vector<Adapter> adapters;
     AdapterAnswers adapter_answers;
     FileTransferSettings file_transfer;

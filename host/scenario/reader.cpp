@@ -4,6 +4,7 @@
 #include "host/scenario/controller_reader.h"
 #include "host/scenario/fault_steps.h"
 #include "host/scenario/hypervisor_reader.h"
+#include "host/scenario/network_reader.h"
 #include "host/scenario/read_file.h"
 #include "host/scenario/service_reader.h"
 #include "host/scenario/table_reader.h"
@@ -140,6 +141,9 @@ Description parse_description(std::string_view text, const std::string &source) 
     }
     if (auto table = in.table("hypervisor")) {
         out.hypervisor = read_hypervisor(*std::move(table));
+    }
+    if (auto table = in.table("network")) {
+        out.network = read_network(*std::move(table));
     }
     read_adapters(in, out);
     if (auto table = in.table("file_transfer")) {

@@ -21,6 +21,7 @@ Scenario::Scenario(Description description)
       controller(std::move(description.controller)),
       file_transfer(std::move(description.file_transfer)),
       hypervisor(std::move(description.hypervisor)),
+      network(std::move(description.network)),
       adapters(std::move(description.adapters)),
       management_controller(std::move(description.management_controller)),
       hypervisor_service(hypervisor.answers),

@@ -37,6 +37,7 @@ class VELKSCENARIO_API Scenario {
     const ControllerSettings controller;
     const FileTransferSettings file_transfer;
     const HypervisorSettings hypervisor;
+    const NetworkSettings network;
     const std::vector<Adapter> adapters;
     AnswerBook management_controller;
     AnswerBook hypervisor_service;

@@ -28,7 +28,7 @@ fs::path VelkhostTest::write_file(const std::string &name, const std::string &te
 fs::path VelkhostTest::packages() {
     const fs::path folder = place_ / "p";
     if (!fs::exists(folder)) {
-        fs::copy(VELK_PACKAGES_DIR, folder);
+        fs::copy(VELK_PACKAGES_DIR, folder, fs::copy_options::recursive);
     }
     return folder;
 }

@@ -48,8 +48,8 @@ const std::string kMissingStep =
 // clang-format off
 INSTANTIATE_TEST_SUITE_P(Root, ScenarioReaderErrors, ::testing::Values(
     Mistake{"UnknownTable", "[hosts]",
-            "1: unknown key \"hosts\"; known are host, jobs, controller, management_controller, hypervisor, adapter, emulex_fc, "
-            "emulex_cna, qlogic, brocade, broadcom, lsi, file_transfer, fault"},
+            "1: unknown key \"hosts\"; known are host, jobs, controller, management_controller, hypervisor, network, adapter, "
+            "emulex_fc, emulex_cna, qlogic, brocade, broadcom, lsi, file_transfer, fault"},
     Mistake{"NoTable", "host = 1", "1: [host] must be a table, not a whole number"},
     Mistake{"NoArrayOfTables", "fault = 1", "1: \"fault\" must be an array of tables, not a whole number"},
     Mistake{"TableForArray", "\n[fault]", "2: \"fault\" must be an array of tables, not a table"},
