@@ -3,6 +3,8 @@
 set -euo pipefail
 # shellcheck source=scripts/packages.sh
 source "$(dirname -- "${BASH_SOURCE[0]}")/scripts/packages.sh"
+# shellcheck source=scripts/servers.sh
+source "$root/scripts/servers.sh"
 # shellcheck source=scripts/steps.sh
 source "$root/scripts/steps.sh"
 
@@ -39,11 +41,12 @@ main() {
   local steps=("$@") step
   ((${#steps[@]})) || steps=("${default_steps[@]}")
   check_names "${steps[@]}"
-  local sections=(run test)
+  local sections=(run remote test)
   for step in coverage bare; do
     [[ " ${steps[*]} " != *" $step "* ]] || sections+=("$step")
   done
   ensure_packages "${sections[@]}"
+  ensure_servers
   cd "$root"
   mkdir -p build/logs
   for step in "${steps[@]}"; do
