@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <ostream>
 #include <set>
+#include <string_view>
 
 namespace velkhost::testing {
 namespace {
@@ -19,6 +20,8 @@ constexpr const char *kAdapters = "adapters";
 constexpr const char *kDefault = "default";
 // RXC, the bundle, diag, the same bundle.
 constexpr const char *kHypervisor = "hypervisor";
+// 20 packages of every kind.
+constexpr const char *kEverything = "everything";
 
 struct Row {
     const char *scenario;
@@ -42,6 +45,7 @@ const std::vector<Row> kRows = {
     {"controller-no-ping",     kFirmware, 1, 10, 210, {53, 53, 53, 53, 53, 53, 53}},
     {"controller-unknown-text", kFirmware, 1, 10, 140, {57, 57, 57, 57, 57, 57, 57}},
     {"default",                kDefault,  1,  7, 841.4, {50, 50, 50, 50, 50, 50, 50, 50, 50, 50, 53, 50, 50, 50}},
+    {"everything",             kEverything, 1, 7, 921.8, {50, 50, 50, 50, 50, 55, 80, 50, 50, 50, 50, 50, 53, 57, 12, 50, 50, 50, 50, 50}},
     {"hypervisor",             kHypervisor, 0, 7, 200, {50, 59, 50, 50}},
     {"hypervisor-fails",       kHypervisor, 1, 7, 170, {50, 57, 50, 56}},
     {"job-library-lost",       kFirmware, 3, kNone, 60, {}},
@@ -60,6 +64,9 @@ class VelkhostScenario : public VelkhostTest, public ::testing::WithParamInterfa
 
 TEST_P(VelkhostScenario, EndsAsItSays) {
     const Row &row = GetParam();
+    if (VELKHOST_READS_ARCHIVES == 0 && row.list != std::string_view(kFirmware)) {
+        GTEST_SKIP() << "a host for an ABI without libzip cannot read these packages";
+    }
     std::vector<std::string> arguments = {"--scenario",
                                           std::string(kScenarios) + row.scenario + ".toml"};
     const auto uris = example_request(row.list);
