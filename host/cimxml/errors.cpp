@@ -5,35 +5,36 @@
 namespace velkhost::cimxml {
 namespace {
 
-constexpr std::array kNames = {
+// By code.
+constexpr std::array kTexts = {
     "",
-    "CIM_ERR_FAILED",
-    "CIM_ERR_ACCESS_DENIED",
-    "CIM_ERR_INVALID_NAMESPACE",
-    "CIM_ERR_INVALID_PARAMETER",
-    "CIM_ERR_INVALID_CLASS",
-    "CIM_ERR_NOT_FOUND",
-    "CIM_ERR_NOT_SUPPORTED",
-    "CIM_ERR_CLASS_HAS_CHILDREN",
-    "CIM_ERR_CLASS_HAS_INSTANCES",
-    "CIM_ERR_INVALID_SUPERCLASS",
-    "CIM_ERR_ALREADY_EXISTS",
-    "CIM_ERR_NO_SUCH_PROPERTY",
-    "CIM_ERR_TYPE_MISMATCH",
-    "CIM_ERR_QUERY_LANGUAGE_NOT_SUPPORTED",
-    "CIM_ERR_INVALID_QUERY",
-    "CIM_ERR_METHOD_NOT_AVAILABLE",
-    "CIM_ERR_METHOD_NOT_FOUND",
+    "The operation failed",
+    "Access is denied",
+    "Invalid namespace",
+    "A parameter is invalid",
+    "Class not found",
+    "The requested object could not be found",
+    "The requested operation is not supported",
+    "The class has subclasses",
+    "The class has instances",
+    "Superclass not found",
+    "The object exists already",
+    "Property not found",
+    "The value is of another type",
+    "The query language is not supported",
+    "The query is invalid",
+    "The method is not available",
+    "Method not found",
 };
 
 bool is_known(int code) {
-    return code > 0 && static_cast<std::size_t>(code) < kNames.size();
+    return code > 0 && static_cast<std::size_t>(code) < kTexts.size();
 }
 
 }  // namespace
 
-const char *cim_error_name(int code) {
-    return kNames.at(static_cast<std::size_t>(is_known(code) ? code : 1));
+const char *cim_error_text(int code) {
+    return kTexts.at(static_cast<std::size_t>(is_known(code) ? code : 1));
 }
 
 void check(const broker::Status &status) {
@@ -41,7 +42,7 @@ void check(const broker::Status &status) {
         return;
     }
     const CMPIrc code = is_known(status.code) ? status.code : CMPI_RC_ERR_FAILED;
-    std::string text = status.message.empty() ? cim_error_name(code) : status.message;
+    std::string text = status.message.empty() ? cim_error_text(code) : status.message;
     if (code != status.code) {
         text += " (" + std::to_string(status.code) + ")";
     }

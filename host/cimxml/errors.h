@@ -36,9 +36,9 @@ class MessageError : public std::runtime_error {
     std::string cim_error_;
 };
 
-// What DSP0200 (6.6) calls the code: "CIM_ERR_NOT_FOUND"; "CIM_ERR_FAILED" for one it does not
-// know.
-const char *cim_error_name(int code);
+// What a code of DSP0200 (6.6) means, for errors that come without a text; an unknown code has the
+// text of CIM_ERR_FAILED.
+const char *cim_error_text(int code);
 
 // Throws CimError for a status that is an error. Codes that only CMPI knows become 1.
 void check(const broker::Status &status);

@@ -133,6 +133,9 @@ bool Process::read_until(const std::string &text) {
 }
 
 void Process::send_signal(int signal) const {
+    if (pid_ <= 0) {  // which kill takes for everybody
+        throw std::logic_error("the program has ended already");
+    }
     kill(pid_, signal);
 }
 

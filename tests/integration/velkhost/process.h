@@ -44,6 +44,9 @@ class Process {
     // Reads until the output has `text`; false when the program closed it or time was up before.
     bool read_until(const std::string &text);
 
+    // What came on stdout so far.
+    [[nodiscard]] const std::string &out() const { return finished_.out; }
+
     void send_signal(int signal) const;
 
     // Types on the terminal.

@@ -182,9 +182,9 @@ TEST_F(CimxmlMethods, ErrorWithoutTextOrWithACodeOfCmpisOwnIsStillOne) {
                               auto *) {
         return CMPIStatus{code, nullptr};
     };
-    EXPECT_EQ(error_in(extrinsic("Echo", "")), "2 CIM_ERR_ACCESS_DENIED");
+    EXPECT_EQ(error_in(extrinsic("Echo", "")), "2 Access is denied");
     code = static_cast<CMPIrc>(60);
-    EXPECT_EQ(error_in(extrinsic("Echo", "")), "1 CIM_ERR_FAILED (60)");
+    EXPECT_EQ(error_in(extrinsic("Echo", "")), "1 The operation failed (60)");
 }
 
 TEST_F(CimxmlMethods, MethodWithoutAValueHasAnEmptyResponse) {
