@@ -64,6 +64,7 @@ comes_up() {
 # `server`, its process, and `port`.
 start_server() {
   local kind=$1 command=$2 log=$root/build/logs/server.log try
+  mkdir -p "$root/build/logs"
   for ((try = 0; try < 10; try++)); do
     port=$((20000 + (RANDOM * 32768 + RANDOM) % 40000))
     ! listens "$kind" "$port" || continue

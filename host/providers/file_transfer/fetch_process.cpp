@@ -115,8 +115,8 @@ FetchProcess::FetchProcess(const std::filesystem::path &program, const FetchRequ
     socket_ = ends[0];
     start(program, ends[1]);
     ::close(ends[1]);
-    if (!start_failed_ && !send(encode(request))) {
-        start_failed_ = errno;
+    if (!start_failed_) {
+        send(encode(request));
     }
     ::shutdown(socket_, SHUT_WR);
 }
@@ -134,16 +134,16 @@ void FetchProcess::start(const std::filesystem::path &program, int socket) {
     }
 }
 
-bool FetchProcess::send(const std::string &text) const {
+// A fetcher that does not take it has ended, which the next read finds out.
+void FetchProcess::send(const std::string &text) const {
     std::string_view rest = text;
     while (!rest.empty()) {
         const ssize_t sent = ::send(socket_, rest.data(), rest.size(), MSG_NOSIGNAL);
         if (sent < 0 && errno != EINTR) {
-            return false;
+            return;
         }
         rest.remove_prefix(sent < 0 ? 0 : static_cast<std::size_t>(sent));
     }
-    return true;
 }
 
 Piece FetchProcess::next(const std::stop_token &stop) {
@@ -237,14 +237,17 @@ void FetchProcess::finish() {
 }
 
 std::filesystem::path fetcher_beside_this_library() {
-    Dl_info about{};
-    std::error_code error;
-    if (::dladdr(reinterpret_cast<const void *>(&fetcher_beside_this_library), &about) == 0) {
-        return "velkfetch";
-    }
-    // Brokers find libraries through links.
-    const std::filesystem::path library = std::filesystem::canonical(about.dli_fname, error);
-    return library.parent_path() / "velkfetch";
+    // Brokers find libraries through links, which may be gone when another broker of the process
+    // asks again.
+    static const std::filesystem::path known = [] {
+        Dl_info about{};
+        std::error_code error;
+        const auto *here = reinterpret_cast<const void *>(&fetcher_beside_this_library);
+        const bool found = ::dladdr(here, &about) != 0;
+        return std::filesystem::canonical(found ? about.dli_fname : "", error).parent_path() /
+               "velkfetch";
+    }();
+    return known;
 }
 
 }  // namespace velkhost::providers

@@ -26,7 +26,7 @@ class FetchProcess final : public Source {
 
   private:
     void start(const std::filesystem::path &program, int socket);
-    [[nodiscard]] bool send(const std::string &text) const;
+    void send(const std::string &text) const;
     enum class Read { kDone, kEnded, kStopped, kSilent };
     Read read(char *into, std::size_t length, const std::stop_token &stop) const;
     Read wait_for_bytes(const std::stop_token &stop) const;

@@ -51,6 +51,9 @@ FetchOutcome Transfers::run(const FetchRequest &request, StoredFile file, const 
                             const std::stop_token &stop) {
     const auto fault = scenario_->faults.take("filetransfer.fetch", request.url);
     const TransferFault kind = fault ? fault->transfer : TransferFault::kNone;
+    if (fault && kind == TransferFault::kNone) {  // one of all the service's steps
+        return {FetchResult::kFailed, "Failed by the scenario: " + fault->message};
+    }
     const std::string path = file.path();
     if (kind == TransferFault::kFull) {
         file.fill_up();
