@@ -34,7 +34,7 @@ tftp_command() {
 
 serve_tftp() {
   begin_remote "$@"
-  start_server udp tftp_command
+  start_server udp tftp_command "$place/server.log"
   remote_base=tftp://127.0.0.1:$port
 }
 
@@ -68,7 +68,7 @@ sftp_command() {
 serve_sftp() {
   begin_remote "$@"
   write_sftp_files
-  start_server tcp sftp_command
+  start_server tcp sftp_command "$place/server.log"
   say "[127.0.0.1]:$port $(cut -d' ' -f1,2 "$place/host.pub")" >"$place/known_hosts"
   cat >>"$remote_scenario" <<TEXT
 user = "velk"

@@ -60,11 +60,10 @@ comes_up() {
   return 1
 }
 
-# start_server KIND COMMAND: runs COMMAND PORT, which becomes the server, with a free port. Sets
+# start_server KIND COMMAND LOG: runs COMMAND PORT, which becomes the server, with a free port. Sets
 # `server`, its process, and `port`.
 start_server() {
-  local kind=$1 command=$2 log=$root/build/logs/server.log try
-  mkdir -p "$root/build/logs"
+  local kind=$1 command=$2 log=$3 try
   for ((try = 0; try < 10; try++)); do
     port=$((20000 + (RANDOM * 32768 + RANDOM) % 40000))
     ! listens "$kind" "$port" || continue
@@ -74,7 +73,7 @@ start_server() {
     stop_server
   done
   tail -n 20 "$log" >&2
-  die "The server did not start; the whole log is $log"
+  die "The server did not start."
 }
 
 stop_server() {
