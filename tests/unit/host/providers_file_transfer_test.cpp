@@ -94,7 +94,7 @@ TEST_F(FileTransferProvider, LocationOfAnotherKindIsAnInvalidParameter) {
 }
 
 TEST_F(FileTransferProvider, BlockSizeThatTftpDoesNotKnowIsAnInvalidParameter) {
-    for (const std::uint16_t size : {0, 7, 65465, 65535}) {
+    for (const auto size : std::initializer_list<std::uint16_t>{0, 7, 65465, 65535}) {
         const auto reply =
             call("TransferViaTFTP", {{"SourceURI", Value::string("tftp://host/a.xml")},
                                      {"BlockSize", Value::uint16(size)}});
