@@ -204,7 +204,7 @@ void VirtualClock::cancel_child(Token token) {
     }
 }
 
-void VirtualClock::adopt(Token token, Signal &adopted) {
+void VirtualClock::adopt(Token token, Begin begin, Signal &adopted) {
     self() = Self{token, 0};
     if (token != 0) {
         watch_thread_end();
@@ -213,7 +213,7 @@ void VirtualClock::adopt(Token token, Signal &adopted) {
     {
         const std::lock_guard lock(mutex_);
         static_cast<void>(forget_ended(pthread_self()));  // the number of an earlier thread
-        if (takes_part()) {
+        if (takes_part() && begin == Begin::kInTurn) {
             sleeper.wake_us = now_us();
             insert(sleeper);
             suspend_one();

@@ -36,12 +36,13 @@ class VirtualClock {
     // The creation of a thread, in its three places. A thread that takes part counts its child
     // before the child exists: `reserve_child` returns the token that the child adopts, or that
     // the parent cancels when there is to be no child after all. `adopted` is set once the child
-    // has its place in the order of events; it returns when all others pause or wait, so that who
-    // comes first is no matter of chance.
+    // has its place in the order of events. With a turn of its own it returns when all others
+    // pause or wait, so that who comes first is no matter of chance; else at once.
     using Token = unsigned;
     [[nodiscard]] Token reserve_child();
     void cancel_child(Token token);
-    void adopt(Token token, Signal &adopted);
+    enum class Begin { kInTurn, kAtOnce };
+    void adopt(Token token, Begin begin, Signal &adopted);
 
     // The end of the calling thread, as the last thing that it does.
     void thread_ends();
