@@ -9,8 +9,8 @@ source "$root/scripts/servers.sh"
 source "$root/scripts/steps.sh"
 
 readonly all_steps=(format release asan tsan i386 tidy coverage bare)
-# Those that the whole tree has passed so far; the others run by name.
-readonly default_steps=(format release)
+# The others take long, and run by name.
+readonly default_steps=(format release asan tsan i386)
 
 usage() {
   cat <<TEXT
@@ -22,7 +22,7 @@ Installs what is missing and runs the steps; without names: ${default_steps[*]}.
   asan      build and test with the address and undefined-behaviour sanitizers
   tsan      build and test with the thread sanitizer
   i386      build and test for 32 bits
-  tidy      clang-tidy over the project's own sources
+  tidy      clang-tidy over the project's own sources; half an hour at first, then what changed
   coverage  line and branch coverage, with a floor
   bare      run.sh and test.sh in a fresh Debian 12 root (as root)
 Logs are in build/logs/.
