@@ -5,6 +5,7 @@
 
 #include <string>
 
+// NOLINTNEXTLINE(readability-identifier-naming): as the library calls it
 namespace CLI {
 class App;
 }  // namespace CLI

@@ -47,7 +47,7 @@ class NetworkRun {
     NetworkReport execute();
 
   private:
-    ConfigureReport configure(const rig::NetworkCalls &library) const;
+    [[nodiscard]] ConfigureReport configure(const rig::NetworkCalls &library) const;
 
     const NetworkOptions &options_;
     Interrupt &interrupt_;

@@ -112,14 +112,14 @@ class Everything : public ::testing::Test {
 
     [[nodiscard]] bool is_report(const std::string &line) const {
         const auto mark = line.rfind("] ");
-        return mark != line.npos && std::ranges::any_of(ids_, [&](const std::string &id) {
+        return mark != std::string::npos && std::ranges::any_of(ids_, [&](const std::string &id) {
                    return line.compare(mark + 2, id.size() + 2, id + ": ") == 0;
                });
     }
 
     [[nodiscard]] std::string in_short(std::string text) const {
         const std::string folder = packages_.path().string();
-        for (auto at = text.find(folder); at != text.npos; at = text.find(folder)) {
+        for (auto at = text.find(folder); at != std::string::npos; at = text.find(folder)) {
             text.replace(at, folder.size(), "PACKAGES");
         }
         return text;

@@ -29,7 +29,7 @@ class VelkhostNetwork : public VelkhostTest {
         arguments.emplace_back("--json");
         const Finished finished = network(settings, arguments);
         EXPECT_EQ(finished.err, "");
-        const auto out = nlohmann::json::parse(finished.out, nullptr, false);
+        auto out = nlohmann::json::parse(finished.out, nullptr, false);
         EXPECT_FALSE(out.is_discarded()) << finished.out;
         EXPECT_EQ(out["exit_code"], finished.exit_code);
         return out;

@@ -18,7 +18,7 @@
 namespace velktest {
 
 class HypervisorTest : public BrokerTest {
-  protected:
+  public:
     HypervisorTest() {
         use_packages(2);
         set_field(package().TFTPXMLPkgURIs, kLocation);
@@ -34,6 +34,7 @@ class HypervisorTest : public BrokerTest {
     HypervisorTest(const HypervisorTest &) = delete;
     HypervisorTest &operator=(const HypervisorTest &) = delete;
 
+  protected:
     static constexpr const char *kLocation = "file:///pkgs/bundle.xml";
     static constexpr const char *kService = "VMware_SoftwareInstallationService";
     static constexpr const char *kDone =

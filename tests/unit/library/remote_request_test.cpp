@@ -177,7 +177,8 @@ TEST_F(RemoteRequest, MixedKindsAreAllFetchedAsTheFirst) {
         run(row.locations);
         std::vector<std::string> methods;
         for (const std::string &call : up_calls()) {
-            if (const auto from = call.find("Transfer", call.find('.')); from != call.npos) {
+            if (const auto from = call.find("Transfer", call.find('.'));
+                from != std::string::npos) {
                 methods.push_back(call.substr(from, call.find('(') - from));
             }
         }
