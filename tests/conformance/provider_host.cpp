@@ -166,14 +166,21 @@ void ProviderHost::pause(Seconds length) const {
     usleep(static_cast<useconds_t>(std::llround(length * static_cast<Seconds>(kMicroseconds))));
 }
 
+std::vector<Pause> ProviderHost::pauses_of(const PauseLog &log) const {
+    std::vector<Pause> pauses;
+    for (const PauseLog::Entry &entry : log.entries()) {
+        pauses.push_back({since_start(entry.at_us), static_cast<Seconds>(entry.length_us) /
+                                                        static_cast<Seconds>(kMicroseconds)});
+    }
+    return pauses;
+}
+
 std::vector<Pause> ProviderHost::own_pauses() const {
-    const std::lock_guard lock(lock_);
-    return own_pauses_;
+    return pauses_of(own_pauses_);
 }
 
 std::vector<Pause> ProviderHost::other_pauses() const {
-    const std::lock_guard lock(lock_);
-    return other_pauses_;
+    return pauses_of(other_pauses_);
 }
 
 std::vector<FileWrite> ProviderHost::status_writes() const {
@@ -238,11 +245,8 @@ std::vector<std::string> ProviderHost::up_calls() {
 
 void ProviderHost::note_pause(void *host, std::int64_t now_us, std::int64_t length_us) {
     auto &self = *static_cast<ProviderHost *>(host);
-    const std::lock_guard lock(self.lock_);
     const bool own = std::this_thread::get_id() == self.owner_;
-    (own ? self.own_pauses_ : self.other_pauses_)
-        .push_back({self.since_start(now_us),
-                    static_cast<Seconds>(length_us) / static_cast<Seconds>(kMicroseconds)});
+    (own ? self.own_pauses_ : self.other_pauses_).add(now_us, length_us);
 }
 
 void ProviderHost::note_file(void *host, const char *path, std::int64_t now_us) {

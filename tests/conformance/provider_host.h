@@ -18,6 +18,7 @@
 
 #include "host/broker/broker.h"
 #include "tests/support/files.h"
+#include "tests/support/pause_log.h"
 #include "tests/support/service_doubles.h"
 
 namespace velktest {
@@ -140,12 +141,13 @@ class ProviderHost {
     void add_service(DoubleBase &service);
     void *symbol(const char *name) const;
     [[nodiscard]] Seconds since_start(std::int64_t time_us) const;
+    [[nodiscard]] std::vector<Pause> pauses_of(const PauseLog &log) const;
 
     const std::thread::id owner_ = std::this_thread::get_id();
     TempFolder folder_;
     mutable std::mutex lock_;  // of what the observers write
-    std::vector<Pause> own_pauses_;
-    std::vector<Pause> other_pauses_;
+    PauseLog own_pauses_;
+    PauseLog other_pauses_;
     std::vector<FileWrite> writes_;
     std::map<std::string, int> passes_;
     std::map<std::string, int> failing_steps_;

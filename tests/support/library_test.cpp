@@ -18,8 +18,8 @@ constexpr std::int64_t kDay = 86'400;
 // 2024-10-04, 08:05:03 UTC.
 constexpr std::int64_t kStart = (20'000 * kDay + kStartSecond) * kMicroseconds;
 
-void note_pause(void *pauses, std::int64_t, std::int64_t length_us) {
-    static_cast<std::vector<int> *>(pauses)->push_back(static_cast<int>(length_us / kMicroseconds));
+void note_pause(void *log, std::int64_t at_us, std::int64_t length_us) {
+    static_cast<PauseLog *>(log)->add(at_us, length_us);
 }
 
 int failing_step(void *steps, const char *step) {
@@ -39,7 +39,7 @@ LibraryTest::LibraryTest() {
     fs::create_directories(root / "var" / "tmp");
     EXPECT_EQ(velkshim_set_root(root.c_str()), 0);
     velkshim_use_virtual_clock(kStart);
-    velkshim_observe_pauses(note_pause, &pauses_);
+    velkshim_observe_pauses(note_pause, &pause_log_);
     velkshim_set_fault_hook(failing_step, &failing_steps_);
 }
 
@@ -61,6 +61,10 @@ std::string LibraryTest::log() const {
 
 void LibraryTest::clear_log() const {
     fs::remove(at(velk::kDebugLog));
+}
+
+std::vector<int> LibraryTest::pauses() const {
+    return pause_log_.lengths(kMicroseconds);
 }
 
 void LibraryTest::fail_step(const std::string &step, int error) {

@@ -12,6 +12,7 @@
 
 #include "tests/support/files.h"
 #include "tests/support/log_text.h"
+#include "tests/support/pause_log.h"
 #include "tests/support/session.h"
 #include "velk/package_table.h"
 
@@ -35,7 +36,9 @@ class LibraryTest : public ::testing::Test {
     void clear_log() const;
 
     // Lengths in seconds of the pauses so far.
-    [[nodiscard]] const std::vector<int> &pauses() const { return pauses_; }
+    [[nodiscard]] std::vector<int> pauses() const;
+
+    [[nodiscard]] const PauseLog &pause_log() const { return pause_log_; }
 
     // From now on the step, such as "unlink:/tmp/velkdebug.txt", fails with this errno value.
     void fail_step(const std::string &step, int error);
@@ -48,7 +51,7 @@ class LibraryTest : public ::testing::Test {
 
   private:
     TempFolder folder_;
-    std::vector<int> pauses_;
+    PauseLog pause_log_;
     std::map<std::string, int> failing_steps_;
 };
 

@@ -15,6 +15,7 @@
 #include "ipmi/kcs_channel.h"
 #include "tests/support/library_test.h"
 #include "tests/unit/library/controller_stand.h"
+#include "velk/request_state.h"
 
 namespace velktest {
 
@@ -25,16 +26,15 @@ class IpmiTest : public LibraryTest, protected ControllerStand {
 
   protected:
     // Lengths of the pauses so far, in milliseconds.
-    [[nodiscard]] const std::vector<int> &pauses_ms() const { return pauses_ms_; }
+    [[nodiscard]] std::vector<int> pauses_ms() const;
 
     // Virtual time since the test began.
     [[nodiscard]] int elapsed_ms() const;
 
-    [[nodiscard]] static bool channel_is_open() { return kcs_fd >= 0; }
+    [[nodiscard]] static bool channel_is_open() { return velk::load(kcs_fd) >= 0; }
 
   private:
     std::int64_t start_us_;
-    std::vector<int> pauses_ms_;
 };
 
 }  // namespace velktest

@@ -41,8 +41,9 @@ class IpmiStatus : public IpmiTest {
         return all;
     }
     [[nodiscard]] std::vector<int> paused() const {
-        return {pauses_ms().begin() + static_cast<std::ptrdiff_t>(paused_before_),
-                pauses_ms().end()};
+        auto all = pauses_ms();
+        all.erase(all.begin(), all.begin() + static_cast<std::ptrdiff_t>(paused_before_));
+        return all;
     }
     [[nodiscard]] int taken_ms() const { return elapsed_ms() - start_ms_; }
 

@@ -96,7 +96,7 @@ TEST_F(NetworkConfig, EndsAtTheFirstLookAfterTheFlagWasTaken) {
     const HostComponent component(flag(), 12);
     EXPECT_EQ(cfgnetwork(1), 0);
     EXPECT_EQ(log(), dated("cfgnetwork :  need recfg"));
-    EXPECT_EQ(std::count(pauses().begin(), pauses().end(), 5), 3);
+    EXPECT_EQ(std::ranges::count(pauses(), 5), 3);
 }
 
 TEST_F(NetworkConfig, FlagTakenDuringTheLastPauseIsInTime) {
