@@ -39,7 +39,12 @@ std::vector<std::span<char>> session_globals() {
 
 void reset_session() {
     for (const std::span<char> global : session_globals()) {
-        std::ranges::fill(global, '\0');
+        if (global.size() == sizeof(int)) {
+            // A watcher at its end may be reading it.
+            velk::store(*reinterpret_cast<int *>(global.data()), 0);
+        } else {
+            std::ranges::fill(global, '\0');
+        }
     }
 }
 
