@@ -9,6 +9,7 @@
 #include "ipmi/oem_request.h"
 #include "velk/bounded_text.h"
 #include "velk/debug_log.h"
+#include "velk/request_state.h"
 
 namespace velk {
 namespace {
@@ -60,7 +61,7 @@ int create_ipmi_transaction(int *handle) {
         log_dated("smm : create_ipmi_transaction failed");
     }
     if (outcome == Outcome::kSucceeded) {
-        *handle = static_cast<int>(request.returned_dword());
+        store(*handle, static_cast<int>(request.returned_dword()));
     }
     return result_of(outcome);
 }
@@ -72,7 +73,7 @@ int destroy_ipmi_transaction(int *handle) {
     }
     const Outcome outcome = request_for(Operation::kDestroy, *handle).send();
     if (outcome == Outcome::kSucceeded) {
-        *handle = kNoTransaction;
+        store(*handle, kNoTransaction);  // a watcher that begins late may be reading it
         log_dated("destroy_ipmi_transaction successfully.");
     }
     return result_of(outcome);

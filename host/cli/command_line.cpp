@@ -129,6 +129,7 @@ int CommandLine::run_parsed() {
         return run_network(network_.options(), interrupt);
     }
     if (!install_->parsed()) {
+        app_.clear();  // else it is the help of the command "help"
         fmt::print("{}", app_.help());
         return 0;
     }

@@ -12,13 +12,13 @@ namespace fs = std::filesystem;
 constexpr const char *kProviderLibrary = "libvelkprovider.so";
 
 fs::path library_folder(const fs::path &prefix) {
-    for (const fs::path &folder : {prefix / "lib/velkhost", prefix / "lib"}) {
+    for (const fs::path &folder : {prefix / "lib/velkhost/parts", prefix / "lib"}) {
         if (fs::exists(folder / kProviderLibrary)) {
             return folder;
         }
     }
     throw RigError(std::string("no ") + kProviderLibrary + " in " + (prefix / "lib").string() +
-                   " or its folder velkhost");
+                   " or its folder velkhost/parts");
 }
 
 // The files of that extension, by name.

@@ -2,7 +2,7 @@
 // an installation have the same shape around the program:
 //
 //     bin/velkhost
-//     lib/velkhost/ or lib/          shared objects
+//     lib/velkhost/parts/ or lib/    shared objects
 //     share/velkhost/mof/            classes
 //     share/velkhost/registration/   registrations
 #pragma once

@@ -4,6 +4,8 @@
 #include <gmock/gmock.h>
 #include <sys/socket.h>
 
+#include <atomic>
+
 namespace velkhost::testing {
 namespace {
 
@@ -156,7 +158,7 @@ TEST_F(SftpTransfer, LineThatIsCutInTheMiddleFailsAtOnce) {
 }
 
 TEST_F(SftpTransfer, ServerThatIsKilledInTheMiddleFails) {
-    bool killed = false;
+    std::atomic<bool> killed{false};
     const Relay relay(SOCK_STREAM, server_->port(),
                       {.good_bytes = 60'000,
                        .then =

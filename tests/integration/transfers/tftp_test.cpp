@@ -4,6 +4,8 @@
 #include <gmock/gmock.h>
 #include <sys/socket.h>
 
+#include <atomic>
+
 namespace velkhost::testing {
 namespace {
 
@@ -86,7 +88,7 @@ TEST_F(TftpTransfer, LineThatFallsSilentInTheMiddleIsATimeOut) {
 }
 
 TEST_F(TftpTransfer, ServerThatIsKilledInTheMiddleIsATimeOut) {
-    bool killed = false;
+    std::atomic<bool> killed{false};
     const Relay relay(SOCK_DGRAM, server_->port(), {.good_bytes = 60'000, .then = [&] {
                                                         server_->kill();
                                                         killed = true;

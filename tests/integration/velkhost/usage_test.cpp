@@ -30,6 +30,7 @@ TEST_F(VelkhostUsage, VersionAndHelpAreNoErrors) {
         EXPECT_THAT(finished.out, HasSubstr("install"));
     }
     EXPECT_THAT(velkhost({"install", "--help"}).out, HasSubstr("Exit codes:"));
+    EXPECT_EQ(velkhost({"help"}).out, velkhost({"--help"}).out);
 }
 
 TEST_F(VelkhostUsage, WrongCommandLinesAreTwo) {
@@ -76,7 +77,8 @@ TEST_F(VelkhostUsage, InstalledProgramFindsItsPartsAroundItself) {
     const Finished alone = Process::on_pipes(installed, environment()).wait();
     EXPECT_EQ(alone.exit_code, 4);
     EXPECT_THAT(alone.err, HasSubstr("libvelkprovider.so"));
-    fs::create_directory_symlink(build / "lib", prefix / "lib/velkhost");
+    fs::create_directories(prefix / "lib/velkhost");
+    fs::create_directory_symlink(build / "lib", prefix / "lib/velkhost/parts");
     fs::create_directory_symlink(build / "share", prefix / "share");
     EXPECT_EQ(Process::on_pipes(installed, environment()).wait().exit_code, 0);
     EXPECT_TRUE(run_folders().empty());

@@ -110,13 +110,13 @@ TEST(RigRunFolder, RemovalOfWhatIsNotThereSucceeds) {
 TEST(RigParts, AreFoundAroundAnInstalledProgram) {
     const Place place;
     make_file(place / "bin/velkhost");
-    make_file(place / "lib/velkhost/libvelkprovider.so");
+    make_file(place / "lib/velkhost/parts/libvelkprovider.so");
     make_file(place / "share/velkhost/mof/zeb_cimv2.mof");
     make_file(place / "share/velkhost/mof/cim_base.mof");
     make_file(place / "share/velkhost/registration/b.reg");
     make_file(place / "share/velkhost/registration/a.reg");
     const Parts parts = Parts::around(place / "bin");
-    EXPECT_EQ(parts.libraries, place / "lib/velkhost");
+    EXPECT_EQ(parts.libraries, place / "lib/velkhost/parts");
     EXPECT_EQ(parts.mof_files, std::vector<fs::path>{place / "share/velkhost/mof/zeb_cimv2.mof"});
     EXPECT_EQ(parts.registrations,
               (std::vector<fs::path>{place / "share/velkhost/registration/a.reg",
