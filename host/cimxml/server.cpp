@@ -75,7 +75,6 @@ Server::Server(const Endpoint &endpoint, ServerOptions options)
 
 Server::~Server() {
     close();
-    loop_.join();
     {
         const std::lock_guard lock(mutex_);
         ended_ = true;
@@ -90,6 +89,9 @@ void Server::close() {
     closing_ = true;
     const std::uint64_t one = 1;
     [[maybe_unused]] const ssize_t count = write(wake_.get(), &one, sizeof one);
+    if (loop_.joinable()) {
+        loop_.join();
+    }
 }
 
 // -- The event loop --
