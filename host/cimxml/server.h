@@ -50,7 +50,8 @@ class Server {
     [[nodiscard]] std::size_t active() const { return active_.load(); }
     [[nodiscard]] std::uint64_t answered() const { return answered_.load(); }
 
-    // Takes no connection and no request any more; those under way are answered. Does not wait.
+    // Takes no connection and no request any more; those under way are answered, and not waited
+    // for.
     void close();
 
   private:
