@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Does what a newcomer does on a bare Debian 12: a fresh root without compiler or CMake, a clone of
-# this repository, ./run.sh, ./test.sh. Only committed files take part. Runs as root; needs git,
-# mmdebstrap and this machine's package sources, nothing else from outside.
+# this repository, ./run.sh, ./test.sh; and in another such root, an installation of the packages
+# that the tests made. Only committed files take part. Runs as root; needs git, mmdebstrap and this
+# machine's package sources, nothing else from outside.
 set -euo pipefail
 # shellcheck source=scripts/common.sh
 source "$(dirname -- "${BASH_SOURCE[0]}")/../../../scripts/common.sh"
@@ -10,7 +11,8 @@ readonly suite=bookworm
 readonly checkout="/srv/a checkout/velkprovider"  # a path with a blank must do
 keep=''
 steps=()
-bare=''
+bare=''      # the root in use
+roots=()     # all that were made
 
 usage() {
   say "usage: tests/integration/bare/bare.sh [--keep] [STEP...]"
@@ -32,17 +34,19 @@ unmount_all() {
   local point
   while read -r point; do
     umount -- "$point" || umount --lazy -- "$point"
-  done < <(findmnt --raw --noheadings --output TARGET | grep -F "$bare/" | sort -r)
+  done < <(findmnt --raw --noheadings --output TARGET | grep -F "$1/" | sort -r)
 }
 
 clean_up() {
-  [[ $bare ]] || return 0
-  unmount_all
-  if [[ $keep ]]; then
-    say "The root is kept in $bare"
-  else
-    rm -rf --one-file-system -- "$bare"
-  fi
+  local root_folder
+  for root_folder in "${roots[@]}"; do
+    unmount_all "$root_folder"
+    if [[ $keep ]]; then
+      say "A root is kept in $root_folder"
+    else
+      rm -rf --one-file-system -- "$root_folder"
+    fi
+  done
 }
 
 # This machine's own package sources and the keys and proxy that go with them.
@@ -54,6 +58,9 @@ make_root() {
   proxy=$(apt-config shell proxy Acquire::http::Proxy | sed "s/^proxy='\(.*\)'$/\1/")
   [[ -z $proxy ]] || options+=(--aptopt="Acquire::http::Proxy \"$proxy\"")
   ! grep -q 'https:' "${sources[@]}" || options+=(--include=ca-certificates)
+  bare=$(mktemp -d /tmp/velk-bare.XXXXXX)
+  roots+=("$bare")
+  chmod 755 "$bare"
   mmdebstrap "${options[@]}" "$suite" "$bare" "${sources[@]}"
 }
 
@@ -88,11 +95,26 @@ expect_bare() {
   done
 }
 
+# Installs the packages of the first root into one of their own, uses them and removes them.
+try_packages() {
+  local packages=("$bare$checkout/build/release/packages-deb/"*.deb) examples=/usr/share/velkhost/examples
+  [[ -f ${packages[0]} ]] || die "No packages were made"
+  timed "making another bare root" make_root
+  cp -- "${packages[@]}" "$bare/srv"
+  mount_kernel_folders
+  expect_bare
+  inside apt-get -qq update
+  timed "installing the packages" inside sh -c 'apt-get -qq install -y --no-install-recommends /srv/*.deb >/dev/null'
+  inside "$examples/make_packages.sh" /srv/packages
+  inside sh -c 'cd /srv/packages && velkhost install --scenario /usr/share/velkhost/scenarios/default.toml \
+    zeb_fw_rxc_r1ao58-3.10_anyos.xml lsi_fw_sas_9240-20.12.0-0004_anyos.xml'
+  timed "removing them" inside apt-get -qq purge -y velkhost velkprovider
+  [[ ! -e $bare/usr/lib/velkhost && ! -e $bare/usr/lib/cim ]] || die "The packages left something behind"
+}
+
 main() {
   parse_arguments "$@"
   ((EUID == 0)) || die "Making a root and changing into it takes root rights"
-  bare=$(mktemp -d /tmp/velk-bare.XXXXXX)
-  chmod 755 "$bare"
   trap clean_up EXIT
   trap 'exit 130' INT TERM
   timed "making the bare root" make_root
@@ -102,6 +124,10 @@ main() {
   timed "run.sh, first time" inside "$checkout/run.sh"
   timed "run.sh, second time" inside "$checkout/run.sh"
   timed "test.sh" inside "$checkout/test.sh" "${steps[@]}"
+  # The release step makes them; without steps it is among those that run.
+  if [[ -z ${steps[*]} || " ${steps[*]} " == *" release "* ]]; then
+    try_packages
+  fi
 }
 
 main "$@"
