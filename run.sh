@@ -15,7 +15,8 @@ Builds what is missing and runs `velkhost install` on the example packages, as
 scenarios/default.toml describes the host.
   tftp, sftp        fetches them from a real server, which is started on the loopback
                     interface and ended again; package URIs cannot be given then
-  --packages LIST   those of examples/LIST.list: default, firmware or adapters
+  --packages LIST   those of examples/LIST.list: default, firmware, adapters, hypervisor,
+                    everything
 Other arguments go to velkhost, such as --json, --clock real, --scenario FILE; package
 URIs among them replace the examples.
 The exit code is velkhost's, or 3 when packages must be installed by hand first. Without
@@ -88,7 +89,7 @@ main() {
   case ${1-} in tftp | sftp) remote=$1 && shift ;; esac
   if [[ ${1-} == --packages ]]; then
     list=${2-}
-    [[ -f $root/examples/$list.list ]] || die "--packages needs the name of a list: default, firmware or adapters"
+    [[ -f $root/examples/$list.list ]] || die "--packages needs the name of a list in examples/: default, firmware, ..."
     shift 2
   fi
   [[ ${1-} != -- ]] || shift
