@@ -180,7 +180,7 @@ TEST(ExampleAdapters, EveryArchiveHasItsRow) {
     }
     std::set<std::string> archives;
     for (const fs::path &descriptor : velktest::examples::descriptors()) {
-        if (fs::exists(fs::path(descriptor).replace_extension())) {
+        if (fs::exists(fs::path(descriptor).replace_extension() / "payload.xml")) {
             archives.insert(descriptor.stem().string());
         }
     }
