@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <limits>
 #include <optional>
 #include <utility>
 
@@ -25,12 +26,15 @@ bool has_control(std::string_view text) {
     });
 }
 
+// The largest number stands for all that are larger.
 std::optional<std::size_t> number_from(std::string_view text, int base) {
     std::size_t number = 0;
     const char *const end = text.data() + text.size();
     const auto read = std::from_chars(text.data(), end, number, base);
-    const bool good = read.ec == std::errc() && read.ptr == end;
-    return good ? std::optional(number) : std::nullopt;
+    if (read.ec == std::errc::invalid_argument || read.ptr != end) {
+        return std::nullopt;
+    }
+    return read.ec == std::errc() ? number : std::numeric_limits<std::size_t>::max();
 }
 
 }  // namespace

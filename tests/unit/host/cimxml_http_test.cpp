@@ -76,7 +76,6 @@ TEST(CimxmlHttp, WhatIsNoRequestIsRefused) {
     EXPECT_EQ(status_of(request(" folded\r\n")), 400);
     EXPECT_EQ(status_of(request("")), 411);
     EXPECT_EQ(status_of(request("Content-Length: -1\r\n")), 400);
-    EXPECT_EQ(status_of(request("Content-Length: 99999999999999999999999\r\n")), 400);
     EXPECT_EQ(status_of(request("Content-Length: 1\r\nContent-Length: 2\r\n")), 400);
     EXPECT_EQ(status_of(request("Content-Length: 1\r\nTransfer-Encoding: chunked\r\n")), 400);
     EXPECT_EQ(status_of(request("Transfer-Encoding: gzip\r\n")), 501);
@@ -92,11 +91,13 @@ TEST(CimxmlHttp, SizesAreBounded) {
     const std::string field = "x: " + std::string(40, 'a') + "\r\n";
     EXPECT_EQ(status_of(request(field + field + field), limits), 431);
     EXPECT_EQ(status_of(request("Content-Length: 11\r\n"), limits), 413);
+    EXPECT_EQ(status_of(request("Content-Length: 99999999999999999999999\r\n"), limits), 413);
     EXPECT_EQ(status_of(request("Content-Length: 10\r\n", "0123456789"), limits), 0);
     const std::string chunks = "5\r\nhello\r\n6\r\n";
     EXPECT_EQ(status_of(request("Transfer-Encoding: chunked\r\n", chunks), limits), 413);
-    EXPECT_EQ(status_of(request("Transfer-Encoding: chunked\r\n", "FFFFFFFFFFFFFFFF\r\n"), limits),
-              413);
+    for (const char *size : {"B\r\n", "FFFFFFFFFFFFFFFF\r\n", "10000000000000000\r\n"}) {
+        EXPECT_EQ(status_of(request("Transfer-Encoding: chunked\r\n", size), limits), 413) << size;
+    }
 }
 
 TEST(CimxmlHttp, BrokenConnectionStaysBroken) {
