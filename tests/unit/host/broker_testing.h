@@ -94,7 +94,7 @@ class BrokerTest : public ::testing::Test {
     BrokerTest() {
         add_test_classes(broker.repository());
         context_provider_.invoke = [this](const CMPIContext *context, const auto *, const auto *,
-                                         const char *, const CMPIArgs *, CMPIArgs *) {
+                                          const char *, const CMPIArgs *, CMPIArgs *) {
             body_(context);
             return CMPIStatus{CMPI_RC_OK, nullptr};
         };
