@@ -133,8 +133,8 @@ class ShimPreload : public ShimRoot {
     ShimPreload() { std::filesystem::create_symlink(VELKSHIM_LIBRARY, shim_); }
 
     std::string run(const std::string &variables) {
-        const std::string command = variables + " LD_PRELOAD=" + shim_.native() +
-                                    " \"" VELKSHIM_TEST_PROGRAM "\" 2>&1";
+        const std::string command =
+            variables + " LD_PRELOAD=" + shim_.native() + " \"" VELKSHIM_TEST_PROGRAM "\" 2>&1";
         FILE *const pipe = popen(command.c_str(), "r");
         std::string output;
         for (int c = std::fgetc(pipe); c != EOF; c = std::fgetc(pipe)) {
