@@ -40,8 +40,8 @@ std::string namespace_path(const Options &options) {
 std::string in_http(const Options &options, std::string_view method, std::string_view object,
                     std::string_view call) {
     const std::string body = fmt::format(
-        "<?xml version=\"1.0\" encoding=\"utf-8\"?><CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\">"
-        "<MESSAGE ID=\"1\" PROTOCOLVERSION=\"1.0\"><SIMPLEREQ>{}</SIMPLEREQ></MESSAGE></CIM>",
+        R"(<?xml version="1.0" encoding="utf-8"?><CIM CIMVERSION="2.0" DTDVERSION="2.0">)"
+        R"(<MESSAGE ID="1" PROTOCOLVERSION="1.0"><SIMPLEREQ>{}</SIMPLEREQ></MESSAGE></CIM>)",
         call);
     const std::string authorization =
         options.url.credentials.empty()
@@ -62,7 +62,7 @@ Message intrinsic(const Options &options, const char *method, const std::string 
 }
 
 std::string class_parameter(const Options &options) {
-    return fmt::format("<IPARAMVALUE NAME=\"ClassName\"><CLASSNAME NAME=\"{}\"/></IPARAMVALUE>",
+    return fmt::format(R"(<IPARAMVALUE NAME="ClassName"><CLASSNAME NAME="{}"/></IPARAMVALUE>)",
                        options.class_name);
 }
 

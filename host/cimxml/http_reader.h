@@ -10,9 +10,9 @@
 namespace velkhost::cimxml {
 
 struct HttpLimits {
-    std::size_t line = 8192;             // of a request line or a field
-    std::size_t fields = 32 * 1024;      // of all fields of a request, and of its trailers
-    std::size_t body = 4 * 1024 * 1024;  // after chunks have been put together
+    std::size_t line = 8192;       // of a request line or a field
+    std::size_t fields = 32'768;   // of all fields of a request, and of its trailers
+    std::size_t body = 4'194'304;  // after chunks have been put together
 };
 
 class HttpReader {

@@ -13,7 +13,7 @@ void WbemTest::serve(std::vector<std::string> arguments) {
     host_.emplace(Process::on_pipes(command(arguments), environment()));
     const bool listens = host_->read_until("/cimom\n");
     std::smatch match;
-    const std::regex form("listening on http://127\\.0\\.0\\.1:(\\d+)/cimom");
+    const std::regex form(R"(listening on http://127\.0\.0\.1:(\d+)/cimom)");
     if (!listens || !std::regex_search(host_->out(), match, form)) {
         const Finished finished = host_->wait();
         host_.reset();

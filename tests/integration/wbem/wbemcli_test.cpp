@@ -14,9 +14,9 @@ using ::testing::Not;
 using ::testing::StartsWith;
 
 constexpr const char *kKeys =
-    ":PAKRO_VMpkgInstallationService.SystemCreationClassName=\"CIM_ComputerSystem\","
-    "SystemName=\"esxi-01.example.com\",CreationClassName=\"ZEB_PackageInstallationBroker\","
-    "Name=\"ZEB:ZEB_PackageInstallationBroker\"";
+    R"(:PAKRO_VMpkgInstallationService.SystemCreationClassName="CIM_ComputerSystem",)"
+    R"(SystemName="esxi-01.example.com",CreationClassName="ZEB_PackageInstallationBroker",)"
+    R"(Name="ZEB:ZEB_PackageInstallationBroker")";
 
 class Wbemcli : public WbemTest {
   protected:
@@ -87,7 +87,7 @@ TEST_F(Wbemcli, OneClass) {
     EXPECT_THAT(ask({"gc", place() + kService}),
                 StartsWith(here() + kService + " SystemCreationClassName="));
     EXPECT_THAT(ask({"gcd", place() + kService}),
-                HasSubstr("<PARAMETER.ARRAY NAME=\"InstallOptions\" TYPE=\"uint16\">"));
+                HasSubstr(R"(<PARAMETER.ARRAY NAME="InstallOptions" TYPE="uint16">)"));
     EXPECT_THAT(complaint({"gc", place() + ":No_Such"}), StartsWith("(6) CIM_ERR_NOT_FOUND: "));
 }
 
@@ -98,8 +98,8 @@ TEST_F(Wbemcli, Associations) {
     const std::string port_path = "http://" + names.substr(0, names.find('\n'));
     const std::string connector =
         here("root/emulex") +
-        ":ELXUCNA_PhysicalConnector.Tag=\"emulex_cna:1/port0\",CreationClassName=\"ELXUCNA_Physical"
-        "Connector\"";
+        R"(:ELXUCNA_PhysicalConnector.Tag="emulex_cna:1/port0",CreationClassName="ELXUCNA_Physical)"
+        R"(Connector")";
     EXPECT_EQ(ask({"ain", port_path}), connector + "\n");
     EXPECT_EQ(ask({"ain", "-ac", "ELXUCNA_Realizes", port_path}), connector + "\n");
     EXPECT_THAT(ask({"ai", port_path}), StartsWith(connector + " Tag=\"emulex_cna:1/port0\","));

@@ -91,7 +91,7 @@ TEST_F(CimxmlEndpoint, BodiesThatAreNoMessageAreRefused) {
     EXPECT_EQ(refusal(""), "400 request-not-well-formed");
     EXPECT_EQ(refusal("<CIM>"), "400 request-not-well-formed");
     EXPECT_EQ(refusal("<A/>"), not_valid);
-    EXPECT_EQ(refusal("<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"/>"), not_valid);
+    EXPECT_EQ(refusal(R"(<CIM CIMVERSION="2.0" DTDVERSION="2.0"/>)"), not_valid);
     EXPECT_EQ(refusal(replaced(" CIMVERSION=\"2.0\"", "")), not_valid);
     EXPECT_EQ(refusal(replaced(" ID=\"4&amp;2\"", "")), not_valid);
     EXPECT_EQ(refusal(replaced("IMETHODCALL NAME=\"EnumerateClassNames\"", "IMETHODCALL")),
@@ -101,9 +101,8 @@ TEST_F(CimxmlEndpoint, BodiesThatAreNoMessageAreRefused) {
     EXPECT_EQ(refusal(replaced(kPlace, std::string(kPlace) + "<VALUE/>")), not_valid);
     EXPECT_EQ(refusal(message("<A/>")), not_valid);
     EXPECT_EQ(refusal(message("")), not_valid);
-    const std::string export_request =
-        "<CIM CIMVERSION=\"2.0\" DTDVERSION=\"2.0\"><MESSAGE ID=\"1\" "
-        "PROTOCOLVERSION=\"1.0\"><SIMPLEEXPREQ/></MESSAGE></CIM>";
+    const std::string export_request = R"(<CIM CIMVERSION="2.0" DTDVERSION="2.0"><MESSAGE ID="1" )"
+                                       R"(PROTOCOLVERSION="1.0"><SIMPLEEXPREQ/></MESSAGE></CIM>)";
     EXPECT_EQ(refusal(export_request), not_valid);
 }
 
@@ -114,8 +113,8 @@ TEST_F(CimxmlEndpoint, OtherVersionsAndBatchesAreNotImplemented) {
               "501 unsupported-dtd-version");
     EXPECT_EQ(refusal(replaced("PROTOCOLVERSION=\"1.0\"", "PROTOCOLVERSION=\"2.0\"")),
               "501 unsupported-protocol-version");
-    EXPECT_EQ(refusal("<CIM CIMVERSION=\"2.3\" DTDVERSION=\"2.3\"><MESSAGE ID=\"1\" "
-                      "PROTOCOLVERSION=\"1.1\"><MULTIREQ/></MESSAGE></CIM>"),
+    EXPECT_EQ(refusal(R"(<CIM CIMVERSION="2.3" DTDVERSION="2.3"><MESSAGE ID="1" )"
+                      R"(PROTOCOLVERSION="1.1"><MULTIREQ/></MESSAGE></CIM>)"),
               "501 multiple-requests-unsupported");
 }
 

@@ -26,7 +26,7 @@ class CimxmlInstances : public EndpointTest {
     static std::string instance_name(const std::string &key_value,
                                      const std::string &parameter = "InstanceName") {
         return "<IPARAMVALUE NAME=\"" + parameter +
-               "\"><INSTANCENAME CLASSNAME=\"Test_Thing\"><KEYBINDING NAME=\"Name\"><KEYVALUE>" +
+               R"("><INSTANCENAME CLASSNAME="Test_Thing"><KEYBINDING NAME="Name"><KEYVALUE>)" +
                key_value + "</KEYVALUE></KEYBINDING></INSTANCENAME></IPARAMVALUE>";
     }
     static std::vector<std::string> names_of(const XmlElement &instance) {
@@ -178,9 +178,9 @@ TEST_F(CimxmlInstances, AssociationsOfClassesAreNotSupported) {
 TEST_F(CimxmlInstances, KeysThatAreNoneOfTheirTypeAreInvalid) {
     const XmlElement response = intrinsic(
         "GetInstance",
-        "<IPARAMVALUE NAME=\"InstanceName\"><INSTANCENAME CLASSNAME=\"Test_Counter\"><KEYBINDING "
-        "NAME=\"Number\"><KEYVALUE VALUETYPE=\"numeric\">x</KEYVALUE></KEYBINDING></INSTANCENAME>"
-        "</IPARAMVALUE>");
+        R"(<IPARAMVALUE NAME="InstanceName"><INSTANCENAME CLASSNAME="Test_Counter"><KEYBINDING )"
+        R"(NAME="Number"><KEYVALUE VALUETYPE="numeric">x</KEYVALUE></KEYBINDING></INSTANCENAME>)"
+        R"(</IPARAMVALUE>)");
     EXPECT_EQ(error_in(response), "4 Number: \"x\" is no uint32");
 }
 

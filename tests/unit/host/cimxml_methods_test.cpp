@@ -115,10 +115,10 @@ TEST_F(CimxmlMethods, ScalarForAnArrayStaysAScalar) {
 TEST_F(CimxmlMethods, ReferencesGoThroughWithTheirKeys) {
     const std::string path =
         std::string("<LOCALINSTANCEPATH>") + kPlace +
-        "<INSTANCENAME CLASSNAME=\"Test_Counter\">"
-        "<KEYBINDING NAME=\"Number\"><KEYVALUE VALUETYPE=\"string\">5</KEYVALUE>"
-        "</KEYBINDING><KEYBINDING NAME=\"Up\"><KEYVALUE>true</KEYVALUE>"
-        "</KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>";
+        R"(<INSTANCENAME CLASSNAME="Test_Counter">)"
+        R"(<KEYBINDING NAME="Number"><KEYVALUE VALUETYPE="string">5</KEYVALUE>)"
+        R"(</KEYBINDING><KEYBINDING NAME="Up"><KEYVALUE>true</KEYVALUE>)"
+        R"(</KEYBINDING></INSTANCENAME></LOCALINSTANCEPATH>)";
     const XmlElement element = echoed("F", "<VALUE.REFERENCE>" + path + "</VALUE.REFERENCE>");
     EXPECT_EQ(*element.attribute("PARAMTYPE"), "reference");
     const XmlElement &local = element.children.at(0).children.at(0);
@@ -144,8 +144,8 @@ TEST_F(CimxmlMethods, ArraysOfReferencesAreRefarrays) {
 
 TEST_F(CimxmlMethods, EmbeddedInstancesAreDocumentsInTexts) {
     const std::string instance =
-        "&lt;INSTANCE CLASSNAME=\"Test_Thing\"&gt;&lt;PROPERTY NAME=\"Mode\" TYPE=\"uint16\"&gt;"
-        "&lt;VALUE&gt;3&lt;/VALUE&gt;&lt;/PROPERTY&gt;&lt;/INSTANCE&gt;";
+        R"(&lt;INSTANCE CLASSNAME="Test_Thing"&gt;&lt;PROPERTY NAME="Mode" TYPE="uint16"&gt;)"
+        R"(&lt;VALUE&gt;3&lt;/VALUE&gt;&lt;/PROPERTY&gt;&lt;/INSTANCE&gt;)";
     const XmlElement element =
         echoed("E", "<VALUE>" + instance + "</VALUE>", "EmbeddedObject=\"instance\"");
     EXPECT_EQ(*element.attribute("EmbeddedObject"), "instance");

@@ -81,7 +81,7 @@ TEST(CimxmlXml, DepthIsBounded) {
 
 TEST(CimxmlXml, EveryCutOfADocumentIsRefused) {
     const std::string document =
-        "<?xml version=\"1.0\"?><A b=\"1&amp;2\"><!-- c --><B><![CDATA[d]]></B>e&#65;</A>";
+        R"(<?xml version="1.0"?><A b="1&amp;2"><!-- c --><B><![CDATA[d]]></B>e&#65;</A>)";
     EXPECT_EQ(read_xml(document).name, "A");
     for (std::size_t length = 0; length < document.size(); ++length) {
         EXPECT_THROW(read_xml(document.substr(0, length)), XmlError) << length;
