@@ -58,10 +58,12 @@ inline void overlay(std::span<char> buffer, std::string_view text) {
     if (offset >= buffer.size()) {
         return offset;
     }
+    // NOLINTBEGIN(cppcoreguidelines-init-variables,clang-analyzer-valist.*): va_start sets it
     std::va_list arguments;
     va_start(arguments, format);
     std::vsnprintf(buffer.data() + offset, buffer.size() - offset, format, arguments);
     va_end(arguments);
+    // NOLINTEND(cppcoreguidelines-init-variables,clang-analyzer-valist.*)
     return offset + view(buffer.subspan(offset)).size();
 }
 
