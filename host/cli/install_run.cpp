@@ -42,26 +42,15 @@ InstallRun::InstallRun(const InstallOptions &options, Interrupt &interrupt, View
       interrupt_(interrupt),
       view_(view),
       real_start_(real_seconds()),
-      locations_(split_locations(options.uris)) {
-    // Made and known in one step, so that no signal finds a folder that nobody removes.
-    const auto held = interrupt_.hold();
-    rig_.emplace(rig::RigOptions{.folder = options.root,
-                                 .scenario_file = options.scenario,
-                                 .virtual_clock = options.virtual_clock});
-    interrupt_.add([folder = rig_->folder().path(), temporary = rig_->folder().is_temporary()] {
-        if (temporary) {
-            rig::remove_folder(folder);
-        }
-    });
+      locations_(split_locations(options.uris)),
+      rig_({.folder = options.root,
+            .scenario_file = options.scenario,
+            .virtual_clock = options.virtual_clock},
+           interrupt) {
     interrupt_.add([this] { view_.abandon(); });
-    libraries_output_.emplace(rig_->folder().inside(kBrokerOutput));
 }
 
 InstallRun::~InstallRun() {
-    const auto held = interrupt_.hold();
-    libraries_output_.reset();
-    rig_.reset();
-    interrupt_.drop();
     interrupt_.drop();
 }
 

@@ -1,20 +1,17 @@
 // One run of a request from the setting-up of its host to the report.
 #pragma once
 
+#include "host/cli/guarded_rig.h"
 #include "host/cli/install_options.h"
 #include "host/cli/interrupt.h"
 #include "host/cli/report.h"
-#include "host/cli/stdout_capture.h"
 #include "host/cli/view.h"
-#include "host/rig/rig.h"
-
-#include <optional>
 
 namespace velkhost::cli {
 
 class InstallRun {
   public:
-    // Sets the host up. All references must outlive the run. Throws what rig::Rig throws.
+    // Sets the host up. All references must outlive the run. Throws what GuardedRig throws.
     InstallRun(const InstallOptions &options, Interrupt &interrupt, View &view);
     ~InstallRun();
     InstallRun(const InstallRun &) = delete;
@@ -48,8 +45,7 @@ class InstallRun {
     View &view_;
     const double real_start_;
     std::vector<std::string> locations_;
-    std::optional<rig::Rig> rig_;
-    std::optional<StdoutCapture> libraries_output_;
+    GuardedRig rig_;
     RunReport report_;
     std::int64_t next_look_us_ = 0;  // at the job
 };

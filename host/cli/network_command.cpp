@@ -1,9 +1,9 @@
 #include "host/cli/network_command.h"
 
+#include "host/cli/guarded_rig.h"
 #include "host/cli/network_report.h"
 #include "host/cli/output.h"
 #include "host/cli/stdout_capture.h"
-#include "host/rig/rig.h"
 #include "host/rig/shim_session.h"
 #include "host/rig/text_file.h"
 
@@ -24,25 +24,11 @@ std::string last_words(const rig::RunFolder &folder) {
 class NetworkRun {
   public:
     NetworkRun(const NetworkOptions &options, Interrupt &interrupt)
-        : options_(options), interrupt_(interrupt) {
-        // Made and known in one step, so that no signal finds a folder that nobody removes.
-        const auto held = interrupt_.hold();
-        rig_.emplace(rig::RigOptions{.folder = options.root,
-                                     .scenario_file = options.scenario,
-                                     .virtual_clock = options.virtual_clock});
-        interrupt_.add([folder = rig_->folder().path(), temporary = rig_->folder().is_temporary()] {
-            if (temporary) {
-                rig::remove_folder(folder);
-            }
-        });
-    }
-    ~NetworkRun() {
-        const auto held = interrupt_.hold();
-        rig_.reset();
-        interrupt_.drop();
-    }
-    NetworkRun(const NetworkRun &) = delete;
-    NetworkRun &operator=(const NetworkRun &) = delete;
+        : options_(options),
+          rig_({.folder = options.root,
+                .scenario_file = options.scenario,
+                .virtual_clock = options.virtual_clock},
+               interrupt) {}
 
     NetworkReport execute();
 
@@ -50,8 +36,7 @@ class NetworkRun {
     [[nodiscard]] ConfigureReport configure(const rig::NetworkCalls &library) const;
 
     const NetworkOptions &options_;
-    Interrupt &interrupt_;
-    std::optional<rig::Rig> rig_;
+    GuardedRig rig_;
 };
 
 ConfigureReport NetworkRun::configure(const rig::NetworkCalls &library) const {

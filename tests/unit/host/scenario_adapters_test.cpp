@@ -1,6 +1,6 @@
 // What a scenario says of adapters and of their vendors' services.
-#include "host/scenario/reader.h"
 #include "host/scenario/scenario.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -12,19 +12,6 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
-
-Description parse(const std::string &text) {
-    return parse_description(text, "s.toml");
-}
-
-std::string error_of(const std::string &text) {
-    try {
-        parse(text);
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
-    return "no error";
-}
 
 std::string adapter_error(const std::string &keys) {
     return error_of("[[adapter]]\n" + keys);

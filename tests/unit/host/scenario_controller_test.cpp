@@ -1,5 +1,5 @@
 // What a scenario says of the management controller: its settings, and the faults at its steps.
-#include "host/scenario/reader.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -10,19 +10,6 @@
 
 namespace velkhost::scenario {
 namespace {
-
-Description parse(const std::string &text) {
-    return parse_description(text, "s.toml");
-}
-
-std::string error_of(const std::string &text) {
-    try {
-        parse(text);
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
-    return "no error";
-}
 
 FaultRule fault(const std::string &keys) {
     return parse("[[fault]]\nstep = 'bmc.create'\n" + keys).faults.at(0);

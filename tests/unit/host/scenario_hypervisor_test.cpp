@@ -1,6 +1,6 @@
 // What a scenario says of the hypervisor.
-#include "host/scenario/reader.h"
 #include "host/scenario/scenario.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -16,16 +16,7 @@ using ::testing::IsEmpty;
 using ::testing::Optional;
 
 HypervisorSettings read(const std::string &text) {
-    return parse_description(text, "h.toml").hypervisor;
-}
-
-std::string error_of(const std::string &text) {
-    try {
-        parse_description(text, "h.toml");
-        return "no error";
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
+    return parse(text).hypervisor;
 }
 
 TEST(ScenarioHypervisor, IsTheHostAloneByDefault) {
@@ -54,28 +45,28 @@ TEST(ScenarioHypervisor, HostMayHaveNoService) {
 TEST(ScenarioHypervisor, PackagesNeedANameAndAVersion) {
     for (const char *package : {"esx-base", "esx-base ", " 5.1", "", "a b c"}) {
         EXPECT_EQ(error_of("[hypervisor]\ninstalled = ['x 1', '" + std::string(package) + "']\n"),
-                  "h.toml:2: [hypervisor] \"installed\" must hold names with a version, not \"" +
+                  "s.toml:2: [hypervisor] \"installed\" must hold names with a version, not \"" +
                       std::string(package) + '"');
     }
 }
 
 TEST(ScenarioHypervisor, UnknownKeysAndWrongTypesAreErrors) {
     EXPECT_THAT(error_of("[hypervisor]\nsystem = 'a'\n"),
-                HasSubstr("h.toml:2: [hypervisor] unknown key \"system\""));
-    EXPECT_THAT(error_of("[hypervisor]\nsystems = 'a'\n"), HasSubstr("h.toml:2: "));
-    EXPECT_THAT(error_of("[hypervisor]\nearlier_jobs = [1]\n"), HasSubstr("h.toml:2: "));
+                HasSubstr("s.toml:2: [hypervisor] unknown key \"system\""));
+    EXPECT_THAT(error_of("[hypervisor]\nsystems = 'a'\n"), HasSubstr("s.toml:2: "));
+    EXPECT_THAT(error_of("[hypervisor]\nearlier_jobs = [1]\n"), HasSubstr("s.toml:2: "));
 }
 
 TEST(ScenarioHypervisor, ItsStepsTakeFaults) {
     const Description description =
-        parse_description("[[fault]]\nstep = 'hypervisor.install'\ncode = 4\n", "h.toml");
+        parse_description("[[fault]]\nstep = 'hypervisor.install'\ncode = 4\n", "s.toml");
     ASSERT_EQ(description.faults.size(), 1U);
     EXPECT_EQ(description.faults[0].code, 4);
 }
 
 TEST(ScenarioHypervisor, ServiceDealsItsAnswersInTurn) {
     Scenario scenario(parse_description(
-        "[[hypervisor.answer]]\nstatus = 1\n[[hypervisor.answer]]\nreturn_value = 7\n", "h.toml"));
+        "[[hypervisor.answer]]\nstatus = 1\n[[hypervisor.answer]]\nreturn_value = 7\n", "s.toml"));
     EXPECT_EQ(scenario.hypervisor_service.next("x").status, 1);
     EXPECT_EQ(scenario.hypervisor_service.next("x").return_value, 7U);
     EXPECT_EQ(scenario.hypervisor_service.next("x").return_value, 7U);

@@ -1,5 +1,5 @@
 // What a scenario says of the in-band network.
-#include "host/scenario/reader.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -13,16 +13,7 @@ using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 
 NetworkSettings read(const std::string &text) {
-    return parse_description(text, "n.toml").network;
-}
-
-std::string error_of(const std::string &text) {
-    try {
-        parse_description(text, "n.toml");
-        return "no error";
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
+    return parse(text).network;
 }
 
 TEST(ScenarioNetwork, HasNoNodesByDefault) {
@@ -48,17 +39,17 @@ TEST(ScenarioNetwork, KeysAreRead) {
 TEST(ScenarioNetwork, MayNeverBeConfigured) {
     EXPECT_EQ(read("[network]\nconfigure = 'never'\n").configure_seconds, std::nullopt);
     EXPECT_THAT(error_of("[network]\nconfigure = 'soon'\n"),
-                HasSubstr("n.toml:2: [network] \"configure\" must be a whole number of seconds or "
+                HasSubstr("s.toml:2: [network] \"configure\" must be a whole number of seconds or "
                           "\"never\""));
-    EXPECT_THAT(error_of("[network]\nconfigure = 0\n"), HasSubstr("n.toml:2: "));
-    EXPECT_THAT(error_of("[network]\nconfigure = 3601\n"), HasSubstr("n.toml:2: "));
+    EXPECT_THAT(error_of("[network]\nconfigure = 0\n"), HasSubstr("s.toml:2: "));
+    EXPECT_THAT(error_of("[network]\nconfigure = 3601\n"), HasSubstr("s.toml:2: "));
 }
 
 TEST(ScenarioNetwork, NodesNeedEachOfTheirTexts) {
     EXPECT_THAT(error_of("[[network.node]]\ndevice = 'd'\nhypervisor = 'h'\n"),
                 HasSubstr("\"controller\" is missing"));
     EXPECT_THAT(error_of("[[network.node]]\ndevice = ''\nhypervisor = 'h'\ncontroller = 'c'\n"),
-                HasSubstr("n.toml:2: "));
+                HasSubstr("s.toml:2: "));
     EXPECT_THAT(error_of("[[network.node]]\ndevice = 'd'\nhypervisor = 'a b'\ncontroller = 'c'\n"),
                 HasSubstr("must be a text without blanks"));
     EXPECT_THAT(error_of("[[network.node]]\ndevice = 'd'\nhypervisor = 'h'\ncontroller = 'c'\n"

@@ -1,5 +1,5 @@
 // Every way in which a scenario file can be wrong: the message, letter for letter, with its line.
-#include "host/scenario/reader.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -8,15 +8,6 @@
 
 namespace velkhost::scenario {
 namespace {
-
-std::string error_of(std::string_view text) {
-    try {
-        parse_description(text, "s.toml");
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
-    return "no error";
-}
 
 struct Mistake {
     const char *name;

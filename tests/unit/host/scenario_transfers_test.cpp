@@ -1,5 +1,5 @@
 // What a scenario says of the file transfer service: its settings, and the faults of a transfer.
-#include "host/scenario/reader.h"
+#include "tests/unit/host/scenario_testing.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -11,21 +11,8 @@
 namespace velkhost::scenario {
 namespace {
 
-Description parse(const std::string &text) {
-    return parse_description(text, "s.toml");
-}
-
 FileTransferSettings settings(const std::string &keys) {
     return parse("[file_transfer]\n" + keys).file_transfer;
-}
-
-std::string error_of(const std::string &text) {
-    try {
-        parse(text);
-    } catch (const ScenarioError &error) {
-        return error.what();
-    }
-    return "no error";
 }
 
 FaultRule fault(const std::string &keys) {
